@@ -1,0 +1,28 @@
+# room(<name> SOURCES <files>... DEPENDS <targets>...): a folder of this project as a static library.
+# What it links is what it may include; includes are written from the project's root.
+
+set(ROOM_WARNINGS -Wall -Wextra -Werror)
+
+function(room name)
+    cmake_parse_arguments(ROOM "" "" "SOURCES;DEPENDS" ${ARGN})
+    add_library(${name} STATIC ${ROOM_SOURCES})
+    target_compile_options(${name} PRIVATE ${ROOM_WARNINGS})
+    target_include_directories(${name} PUBLIC ${PROJECT_SOURCE_DIR})
+    target_link_libraries(${name} PUBLIC ${ROOM_DEPENDS})
+endfunction()
+
+# program(<name> SOURCES <files>... DEPENDS <targets>...): an executable under the same rules.
+function(program name)
+    cmake_parse_arguments(PROGRAM "" "" "SOURCES;DEPENDS" ${ARGN})
+    add_executable(${name} ${PROGRAM_SOURCES})
+    target_compile_options(${name} PRIVATE ${ROOM_WARNINGS})
+    target_link_libraries(${name} PRIVATE ${PROGRAM_DEPENDS})
+endfunction()
+
+# unit_test(<name> SOURCES <files>... DEPENDS <targets>...): a GoogleTest program, each test known to
+# CTest by itself.
+function(unit_test name)
+    program(${name} ${ARGN})
+    target_link_libraries(${name} PRIVATE GTest::gmock_main)
+    gtest_discover_tests(${name} TEST_PREFIX ${name}. DISCOVERY_MODE PRE_TEST)
+endfunction()
