@@ -1,0 +1,59 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#pragma once
+
+#include <string>
+
+#include "shell/CommandTable.h"
+
+namespace vendor::korvan::bex::wifi::V1_0::implementation {
+
+/**
+ * Puts the WLAN driver into monitor mode on a channel, takes it out again and reads its mode, with
+ * the mode file of the driver and the `iw` tool. The capture itself is done by two services of the
+ * phone's init, which start and stop when their system properties are set.
+ *
+ * Has no state: the mode lives in the driver.
+ */
+class SnifferTool {
+  public:
+    using CmdRunResult = CommandResult;
+
+    SnifferTool();
+    virtual ~SnifferTool();
+    SnifferTool(const SnifferTool&) = delete;
+    SnifferTool& operator=(const SnifferTool&) = delete;
+
+    /**
+     * Enters monitor mode and starts the capture.
+     *
+     * @param channel The IEEE 802.11 channel number in decimal.
+     * @param bandwidth The channel width in MHz: "20" for HT20; anything else is HT40, with the
+     *     second channel above on channels 1, 36 and 149 and below on all others.
+     * @return 0 when every command succeeded, else -1.
+     */
+    virtual int snifferStart(const std::string& channel, const std::string& bandwidth);
+
+    /** Ends the capture and leaves monitor mode, with the interface down. Returns 0 or -1. */
+    virtual int snifferStop();
+
+    /** Tells whether the driver is in monitor mode; true also when its mode cannot be read. */
+    virtual bool isSnifferMode();
+
+    /** Returns the driver's mode: 0 (normal), 4 (monitor), 5 (factory test), -1 for all else. */
+    virtual int getWlanMode();
+
+    /** Runs one command line and collects its output; see runCommand. */
+    void runCmdCom(const std::string& cmd, CmdRunResult& result);
+
+  protected:
+    /** Runs a table through runCmdCom. */
+    int runTable(const Table& table);
+
+  private:
+    /** Reads the driver's mode file; an empty text, with an error line, when it cannot be read. */
+    std::string readMode(const char* caller);
+};
+
+} // namespace vendor::korvan::bex::wifi::V1_0::implementation
