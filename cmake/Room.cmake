@@ -26,3 +26,13 @@ function(unit_test name)
     target_link_libraries(${name} PRIVATE GTest::gmock_main)
     gtest_discover_tests(${name} TEST_PREFIX ${name}. DISCOVERY_MODE PRE_TEST)
 endfunction()
+
+# process_test(<name> <file>... [ENVIRONMENT <NAME=value>...]): pytest files that drive whole programs.
+function(process_test name)
+    cmake_parse_arguments(TEST "" "" "ENVIRONMENT" ${ARGN})
+    list(TRANSFORM TEST_UNPARSED_ARGUMENTS PREPEND ${CMAKE_CURRENT_SOURCE_DIR}/)
+    add_test(NAME ${name} COMMAND /usr/bin/python3 -B -m pytest -q -p no:cacheprovider
+                                  ${TEST_UNPARSED_ARGUMENTS}
+    )
+    set_tests_properties(${name} PROPERTIES ENVIRONMENT "${TEST_ENVIRONMENT}" TIMEOUT 300)
+endfunction()

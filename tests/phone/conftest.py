@@ -1,0 +1,82 @@
+# Copyright 2026 The BEX Wi-Fi Authors
+# SPDX-License-Identifier: Apache-2.0
+"""A simulated phone with the built service and client, for tests that drive all of them together."""
+
+import os
+import pathlib
+import re
+import subprocess
+
+import pytest
+
+ROOT = pathlib.Path(__file__).resolve().parents[2]
+PHONE = ROOT / "simulator/phone"
+SERVICE = "vendor.korvan.bex.wifi@1.0-service"
+CLIENT = "/vendor/bin/bex-wifi-client"
+
+# How liblog prints on a host: tag, priority, date, time, process, thread, text.
+LOG_HEAD = r"\S+ [A-Z] \d\d-\d\d \d\d:\d\d:\d\d +\d+ +\d+ "
+COMMAND = re.compile(
+    rf'^{LOG_HEAD}cmd: "(.*?)" (successful|unsuccessful) execution$', re.MULTILINE | re.DOTALL)
+
+
+class Phone:
+    """One phone; `folder` is where it lives on this machine."""
+
+    def __init__(self, chip, folder):
+        self.folder = folder
+        self.root = folder / "root"
+        self.log = folder / "log"
+        self.phone("create", chip, folder,
+                   "--install", f"{os.environ['BEX_SERVICE']}=/vendor/bin/hw/{SERVICE}",
+                   "--install", f"{ROOT}/service/{SERVICE}.xml=/vendor/etc/vintf/manifest/{SERVICE}.xml",
+                   "--install", f"{os.environ['BEX_CLIENT']}={CLIENT}")
+
+    @staticmethod
+    def phone(*arguments):
+        return subprocess.run([PHONE, *arguments], check=True, timeout=60)
+
+    def up(self):
+        self.phone("up", self.folder)
+
+    def down(self):
+        self.phone("down", self.folder)
+
+    def fault(self, *arguments):
+        self.phone("fault", self.folder, *arguments)
+
+    def command(self, *arguments):
+        """The machine's command line for a command inside the phone."""
+        return [PHONE, "run", self.folder, *arguments]
+
+    def run(self, *arguments):
+        return subprocess.run(self.command(*arguments), capture_output=True, check=False, timeout=60)
+
+    def client(self, *arguments):
+        return self.run(CLIENT, *arguments)
+
+    def commands(self, since=0):
+        """The command lines in the service's log from a byte on, each with whether it succeeded."""
+        text = self.log.read_bytes()[since:].decode(errors="surrogateescape")
+        return [(line, outcome == "successful") for line, outcome in COMMAND.findall(text)]
+
+    def explain(self, *arguments):
+        """The command lines that the explain program expects of a call."""
+        result = subprocess.run(
+            [os.environ["BEX_EXPLAIN"], *arguments], check=True, capture_output=True,
+            env={**os.environ, "HIDL_HOST_ROOT": str(self.root)}, timeout=60)
+        return result.stdout.decode(errors="surrogateescape").splitlines()
+
+
+@pytest.fixture(name="make_phone")
+def make_phone_fixture(tmp_path):
+    """Makes a phone that is not up yet; it is switched off when the test ends."""
+    made = []
+
+    def make(chip):
+        made.append(Phone(chip, tmp_path / chip))
+        return made[-1]
+
+    yield make
+    for phone in made:
+        subprocess.run([PHONE, "down", phone.folder], check=True, capture_output=True, timeout=60)
