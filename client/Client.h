@@ -1,0 +1,59 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#pragma once
+
+#include <chrono>
+#include <ostream>
+#include <string>
+#include <vector>
+
+#include "client/Call.h"
+
+// The command line client, without a process around it.
+
+namespace vendor::korvan::bex::wifi::client {
+
+/** What the client ends with; below 126, so that no shell mistakes one for its own. */
+enum ExitCode {
+    kSuccess = 0,
+    /** The service answered -1 or "failure". */
+    kFailed = 1,
+    kWrongUsage = 2,
+    /** The service cannot be found. */
+    kNoService = 3,
+    /** The transport failed in the call. */
+    kTransportFailed = 4,
+    /** The deadline passed. */
+    kTooLate = 5,
+    /** The result could not be written. */
+    kNotWritten = 6,
+};
+
+/** What the client needs from its surroundings. */
+struct Surroundings {
+    /** Gets the result and nothing else. */
+    std::ostream& out;
+    /** Gets one line for each exit code but 0. */
+    std::ostream& err;
+    /** Looks for the service once. */
+    FindService tryFind;
+    /** Waits for a service that is declared but does not run yet. */
+    FindService awaitFind;
+    /** Whether somebody watches err: then a slow call shows there how long it takes. */
+    bool terminal = false;
+    /** How often that display moves on by one second; only a test has it other than a second. */
+    std::chrono::nanoseconds second = std::chrono::seconds(1);
+};
+
+/**
+ * Runs one command line.
+ *
+ * After kTooLate a thread may still be in the call (see Call.h): end the process with _exit.
+ *
+ * @param arguments The command line without the program's name.
+ * @return an ExitCode.
+ */
+int runClient(const std::vector<std::string>& arguments, const Surroundings& surroundings);
+
+} // namespace vendor::korvan::bex::wifi::client

@@ -1,0 +1,106 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#pragma once
+
+#include <vendor/korvan/bex/wifi/1.0/IWifiService.h>
+
+#include <string>
+#include <vector>
+
+// The table of the interface's methods: what each is called, takes, answers, and how it is called.
+// It works on any IWifiService, a proxy as well as an object in the same process:
+//
+//     Request request;
+//     std::string problem;
+//     if (!readRequest({"RunTxStop", "6"}, &request, &problem)) return usageError(problem);
+//     const Answer answer = request.command->call(service, request.values);
+//     if (answer.delivered) std::cout << answer.text << '\n';
+
+namespace vendor::korvan::bex::wifi::client {
+
+using V1_0::IWifiService;
+
+/** What an argument means. Several methods share one kind; the name is the interface's. */
+struct ArgumentKind {
+    enum class Type { text, boolean };
+
+    const char* name;
+    Type type;
+    const char* meaning;
+    /** The unit of a measure; empty where there is none. */
+    const char* unit;
+    /** The forms that the service makes sense of. Only a boolean is checked by the client. */
+    const char* accepted;
+};
+
+/** What a method answers. */
+struct ResultKind {
+    enum class Type { int32, boolean, text };
+
+    Type type;
+    const char* meaning;
+    /** The answer, as printed, that tells of a failure; empty where no answer does. */
+    const char* failure;
+    /** Where to look after that answer. */
+    const char* advice;
+};
+
+/** One argument as the service gets it. */
+struct Value {
+    /** The bytes from the command line. */
+    std::string text;
+    /** The flag that a boolean argument's text stands for. */
+    bool flag = false;
+};
+
+/** What came of a call. */
+struct Answer {
+    /** Whether the service answered; otherwise transportError tells why not. */
+    bool delivered = false;
+    /** The answer as printed: a decimal number, "true" or "false", or the text byte for byte. */
+    std::string text;
+    /** The platform's description of the failed transaction, for people. */
+    std::string transportError;
+};
+
+/** One method of the interface. */
+struct Command {
+    const char* name;
+    const char* summary;
+    std::vector<const ArgumentKind*> arguments;
+    const ResultKind* result;
+    /** Calls the method; takes as many values as there are arguments. Blocks until it answers. */
+    Answer (*call)(IWifiService& service, const std::vector<Value>& values);
+
+    /** Whether the service's answer tells of a failure: "-1" or "failure", by the kind of result.
+     */
+    bool tellsFailure(const Answer& answer) const;
+};
+
+/** A method with the values to call it with. */
+struct Request {
+    const Command* command = nullptr;
+    std::vector<Value> values;
+};
+
+/** The sixteen methods in the interface's order. */
+const std::vector<Command>& commands();
+
+/** The method of exactly this name, or null. */
+const Command* findCommand(const std::string& name);
+
+/** Tells, on one line and quoting the name, that there is no such method. */
+std::string unknownCommand(const std::string& name);
+
+/**
+ * Reads a method's name and its arguments. Booleans are "true", "false", "1" or "0"; every other
+ * argument is taken as it stands, the empty one and one that is not UTF-8 included.
+ *
+ * @param words The name, then the arguments in the interface's order.
+ * @param problem On failure one line (without a newline) that tells what is wrong.
+ * @return whether the request is complete; otherwise it is unspecified.
+ */
+bool readRequest(const std::vector<std::string>& words, Request* request, std::string* problem);
+
+} // namespace vendor::korvan::bex::wifi::client

@@ -1,0 +1,41 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#include <android/log.h>
+#include <fcntl.h>
+#include <signal.h>
+#include <unistd.h>
+
+#include <iostream>
+
+#include "client/Client.h"
+
+using vendor::korvan::bex::wifi::client::IWifiService;
+using vendor::korvan::bex::wifi::client::runClient;
+
+namespace {
+
+// A standard stream that is closed would lend its number to the connection with the service, and
+// the result would go there. Opened the wrong way round, it still fails when it is used.
+void occupyStandardStreams() {
+    for (int fd = STDIN_FILENO; fd <= STDERR_FILENO; ++fd) {
+        if (fcntl(fd, F_GETFD) == -1) open("/dev/null", fd == STDIN_FILENO ? O_WRONLY : O_RDONLY);
+    }
+}
+
+} // namespace
+
+int main(int argc, char** argv) {
+    occupyStandardStreams();
+    signal(SIGPIPE, SIG_IGN);
+    // Where the platform logs to stderr, its lines would stand among the client's own, which tell
+    // the same.
+    __android_log_set_minimum_priority(ANDROID_LOG_SILENT);
+    const std::vector<std::string> arguments(argv + (argc > 0), argv + argc);
+    const int exitCode =
+            runClient(arguments,
+                      {std::cout, std::cerr, [] { return IWifiService::tryGetService(); },
+                       [] { return IWifiService::getService(); }, isatty(STDERR_FILENO) != 0});
+    // Everything is flushed; a thread may still wait for the service (see Call.h).
+    _exit(exitCode);
+}

@@ -1,0 +1,394 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <future>
+#include <regex>
+#include <sstream>
+#include <thread>
+
+#include "FakeService.h"
+#include "client/Client.h"
+#include "client/Help.h"
+
+namespace vendor::korvan::bex::wifi::client {
+namespace {
+
+using ::android::sp;
+using ::testing::AllOf;
+using ::testing::ElementsAre;
+using ::testing::HasSubstr;
+using ::testing::StartsWith;
+using namespace std::chrono_literals;
+using Words = std::vector<std::string>;
+
+// One line that names the program and holds the text.
+MATCHER_P(IsOneLineWith, text, "") {
+    return std::count(arg.begin(), arg.end(), '\n') == 1 && arg.back() == '\n' &&
+           arg.rfind("bex-wifi-client: ", 0) == 0 && arg.find(text) != arg.npos;
+}
+
+// The one thing that differs from run to run.
+std::string withoutDuration(const std::string& json) {
+    return std::regex_replace(json, std::regex("\"duration_ms\":[0-9]+\\.[0-9]{3},"),
+                              "\"duration_ms\":D,");
+}
+
+class ClientTest : public ::testing::Test {
+  protected:
+    int run(const Words& arguments) {
+        return runClient(arguments, {mOut, mErr, mTryFind, mAwaitFind, mTerminal, mSecond});
+    }
+
+    std::string out() const { return mOut.str(); }
+    std::string err() const { return mErr.str(); }
+
+    sp<FakeService> mService = new FakeService;
+    int mTried = 0;
+    int mAwaited = 0;
+    FindService mTryFind = [this] {
+        ++mTried;
+        return mService;
+    };
+    FindService mAwaitFind = [this] {
+        ++mAwaited;
+        return mService;
+    };
+    bool mTerminal = false;
+    std::chrono::nanoseconds mSecond = 1s;
+    std::ostringstream mOut;
+    std::ostringstream mErr;
+};
+
+TEST_F(ClientTest, PrintsTheNumberAndNothingElse) {
+    EXPECT_EQ(run({"RunTxStop", "6"}), 0);
+    EXPECT_EQ(out(), "0\n");
+    EXPECT_EQ(err(), "");
+    EXPECT_THAT(mService->calls, ElementsAre(Words{"RunTxStop", "6"}));
+}
+
+TEST_F(ClientTest, PrintsTheFlag) {
+    mService->flag = true;
+    EXPECT_EQ(run({"isSnifferMode"}), 0);
+    mService->flag = false;
+    EXPECT_EQ(run({"isMimoSupport"}), 0);
+    EXPECT_EQ(out(), "true\nfalse\n");
+}
+
+TEST_F(ClientTest, PrintsTheTextByteForByte) {
+    mService->text = std::string("\xFF\0\x1B[0m\r\nx ", 9) + std::string(400 * 1024, '\x80');
+    EXPECT_EQ(run({"RunRxStop", "6"}), 0);
+    EXPECT_TRUE(out() == mService->text + "\n");
+    EXPECT_EQ(err(), "");
+}
+
+TEST_F(ClientTest, PassesNegativeNumbersAndWhatFollowsTwoDashes) {
+    EXPECT_EQ(run({"RunTxBGStart", "1", "-20", "--", "--json", "-x"}), 0);
+    EXPECT_THAT(mService->calls, ElementsAre(Words{"RunTxBGStart", "1", "-20", "--json", "-x"}));
+}
+
+TEST_F(ClientTest, LooksOnceWithoutATimeoutAndWaitsWithOne) {
+    EXPECT_EQ(run({"snifferStop"}), 0);
+    EXPECT_EQ(mTried, 1);
+    EXPECT_EQ(mAwaited, 0);
+    EXPECT_EQ(run({"snifferStop", "--timeout", "60"}), 0);
+    EXPECT_EQ(mTried, 1);
+    EXPECT_EQ(mAwaited, 1);
+}
+
+TEST_F(ClientTest, ExitCode1StillPrintsTheResult) {
+    mService->number = -1;
+    EXPECT_EQ(run({"RunTxStop", "6"}), 1);
+    EXPECT_EQ(out(), "-1\n");
+    EXPECT_EQ(err(),
+              "bex-wifi-client: RunTxStop answered -1: which command failed is in the service's "
+              "log (logcat, tags that begin with \"wifi@1.0-\")\n");
+}
+
+TEST_F(ClientTest, ExitCode1ForAnUnknownMode) {
+    mService->number = -1;
+    EXPECT_EQ(run({"getWlanMode"}), 1);
+    EXPECT_EQ(out(), "-1\n");
+    EXPECT_THAT(err(), IsOneLineWith("getWlanMode answered -1: the driver is in another mode"));
+}
+
+TEST_F(ClientTest, ExitCode1ForTheTextFailure) {
+    mService->text = "failure";
+    EXPECT_EQ(run({"RunRxBgStart", "6", "11", "1"}), 1);
+    EXPECT_EQ(out(), "failure\n");
+    EXPECT_THAT(err(), IsOneLineWith("RunRxBgStart answered failure: which command failed is in"));
+}
+
+TEST_F(ClientTest, ExitCode2AndOneLineForWrongUsage) {
+    const std::pair<Words, std::string> cases[] = {
+            {{}, "no method given; see bex-wifi-client --help"},
+            {{"--json"}, "no method given; see bex-wifi-client --help"},
+            {{"RunTx\n", "6"}, "unknown method \"RunTx\\n\"; see bex-wifi-client --help"},
+            {{"runtxstop", "6", "--json"}, "did you mean RunTxStop?"},
+            {{"RunTxStop"},
+             "takes 1 argument (channel), not 0; see bex-wifi-client RunTxStop --help"},
+            {{"RunTxStop", "6", "7"}, "takes 1 argument (channel), not 2"},
+            {{"RunRxNStart", "6", "20", "7", "yes", "1"},
+             "vht is true, false, 1 or 0, not \"yes\""},
+            {{"RunTxStop", "6", "--timeout", "-3"}, "--timeout takes a decimal number of seconds"},
+            {{"RunTxStop", "6", "--timeout"}, "--timeout takes a number of seconds"},
+            {{"RunTxStop", "6", "--verbose"}, "unknown option \"--verbose\""},
+            {{"RunTxStopp", "--help"}, "unknown method \"RunTxStopp\""},
+            {{"list", "all"}, "list takes no arguments; see bex-wifi-client --help"},
+    };
+    for (const auto& [arguments, message] : cases) {
+        mErr.str("");
+        EXPECT_EQ(run(arguments), 2);
+        EXPECT_THAT(err(), IsOneLineWith(message));
+    }
+    EXPECT_EQ(out(), "");
+    EXPECT_EQ(mTried + mAwaited, 0);
+}
+
+TEST_F(ClientTest, ExitCode3WhenThereIsNoService) {
+    mService = nullptr;
+    for (const Words& arguments :
+         {Words{"RunTxStop", "6"}, Words{"RunTxStop", "6", "--timeout", "60"}}) {
+        mErr.str("");
+        EXPECT_EQ(run(arguments), 3);
+        EXPECT_EQ(out(), "");
+        EXPECT_EQ(err(),
+                  "bex-wifi-client: vendor.korvan.bex.wifi@1.0::IWifiService/default is not "
+                  "registered: is vendor.korvan.bex.wifi@1.0-service running, is it in the VINTF "
+                  "manifest, and may this user find it?\n");
+    }
+}
+
+TEST_F(ClientTest, ExitCode4WhenTheTransportFails) {
+    mService->broken = true;
+    for (const Words& arguments :
+         {Words{"RunTxStop", "6"}, Words{"isMimoSupport"}, Words{"RunRxStop", "6"}}) {
+        mErr.str("");
+        EXPECT_EQ(run(arguments), 4);
+        EXPECT_EQ(out(), "");
+        EXPECT_THAT(err(), IsOneLineWith(arguments[0] + " failed in the transport, the service "
+                                                        "may have died: see its log; \""));
+        EXPECT_THAT(err(), HasSubstr("DEAD_OBJECT"));
+    }
+}
+
+// The worker that a passed deadline leaves behind waits at a gate, which the end of the test opens.
+class ClientDeadlineTest : public ClientTest {
+  protected:
+    ~ClientDeadlineTest() override {
+        mRelease.set_value();
+        mEnded.get_future().wait();
+    }
+
+    void wait() {
+        mGate.wait();
+        mEnded.set_value_at_thread_exit();
+    }
+
+    std::promise<void> mRelease;
+    std::promise<void> mEnded;
+    const std::shared_future<void> mGate = mRelease.get_future().share();
+};
+
+TEST_F(ClientDeadlineTest, ExitCode5InTheSearch) {
+    mAwaitFind = [this]() -> sp<IWifiService> {
+        wait();
+        return nullptr;
+    };
+    EXPECT_EQ(run({"RunTxStop", "6", "--timeout", "0.05"}), 5);
+    EXPECT_EQ(out(), "");
+    EXPECT_EQ(err(),
+              "bex-wifi-client: the deadline passed while waiting for the service: is "
+              "vendor.korvan.bex.wifi@1.0-service running?\n");
+}
+
+TEST_F(ClientDeadlineTest, ExitCode5InTheCall) {
+    mService->onCall = [this] { wait(); };
+    EXPECT_EQ(run({"--timeout", "2", "RunTxStop", "6"}), 5);
+    EXPECT_EQ(out(), "");
+    EXPECT_EQ(err(),
+              "bex-wifi-client: the deadline passed in RunTxStop: the service's commands may still "
+              "be running\n");
+}
+
+TEST_F(ClientDeadlineTest, JsonAfterTheDeadline) {
+    mService->onCall = [this] { wait(); };
+    EXPECT_EQ(run({"--timeout", "2", "--json", "RunRxStop", "6"}), 5);
+    EXPECT_EQ(withoutDuration(out()),
+              R"({"schema_version":1,"method":"RunRxStop","arguments":{"channel":"6"},)"
+              R"("ok":false,"value":null,"duration_ms":D,"exit_code":5,"error":)"
+              R"("the deadline passed in RunRxStop: the service's commands may still be running"})"
+              "\n");
+    EXPECT_THAT(err(), IsOneLineWith("the deadline passed in RunRxStop"));
+}
+
+TEST_F(ClientTest, JsonOfSuccess) {
+    EXPECT_EQ(run({"RunTxStop", "6", "--json"}), 0);
+    EXPECT_EQ(withoutDuration(out()),
+              R"({"schema_version":1,"method":"RunTxStop","arguments":{"channel":"6"},)"
+              R"("ok":true,"value":0,"duration_ms":D,"exit_code":0})"
+              "\n");
+    EXPECT_EQ(err(), "");
+}
+
+TEST_F(ClientTest, JsonNamesEveryArgumentAndWritesFlagsAsFlags) {
+    mService->text = "ok";
+    EXPECT_EQ(run({"--json", "RunRxNStart", "6", "20", "a\"\n\xFF", "1", ""}), 0);
+    EXPECT_EQ(withoutDuration(out()),
+              R"({"schema_version":1,"method":"RunRxNStart","arguments":{"channel":"6",)"
+              R"("bandwidth":"20","rate":"a\"\n)"
+              "\uFFFD"
+              R"(","vht":true,"antenna":""},"ok":true,"value":"ok","duration_ms":D,"exit_code":0})"
+              "\n");
+}
+
+TEST_F(ClientTest, JsonWithoutArgumentsAndWithAFlag) {
+    mService->flag = true;
+    EXPECT_EQ(run({"--json", "isMimoSupport"}), 0);
+    EXPECT_EQ(withoutDuration(out()),
+              R"({"schema_version":1,"method":"isMimoSupport","arguments":{},"ok":true,)"
+              R"("value":true,"duration_ms":D,"exit_code":0})"
+              "\n");
+}
+
+TEST_F(ClientTest, JsonOfAFailureKeepsTheValue) {
+    mService->number = -1;
+    EXPECT_EQ(run({"--json", "snifferStop"}), 1);
+    EXPECT_EQ(withoutDuration(out()),
+              R"({"schema_version":1,"method":"snifferStop","arguments":{},"ok":false,"value":-1,)"
+              R"("duration_ms":D,"exit_code":1,"error":"snifferStop answered -1: which command )"
+              "failed is in the service's log (logcat, tags that begin with "
+              "\\\"wifi@1.0-\\\")\"}\n");
+    EXPECT_THAT(err(), IsOneLineWith("snifferStop answered -1"));
+}
+
+TEST_F(ClientTest, JsonWithoutAService) {
+    mService = nullptr;
+    EXPECT_EQ(run({"--json", "snifferStop"}), 3);
+    EXPECT_THAT(withoutDuration(out()),
+                StartsWith(
+                        R"({"schema_version":1,"method":"snifferStop","arguments":{},"ok":false,)"
+                        R"("value":null,"duration_ms":D,"exit_code":3,"error":")"
+                        "vendor.korvan.bex.wifi@1.0::IWifiService/default is not registered"));
+    EXPECT_THAT(out(), ::testing::EndsWith("find it?\"}\n"));
+    EXPECT_THAT(err(), IsOneLineWith("is not registered"));
+}
+
+TEST_F(ClientTest, JsonOfAFailedTransport) {
+    mService->broken = true;
+    EXPECT_EQ(run({"--json", "RunRxStop", "6"}), 4);
+    EXPECT_THAT(withoutDuration(out()),
+                AllOf(StartsWith(R"({"schema_version":1,"method":"RunRxStop",)"
+                                 R"("arguments":{"channel":"6"},"ok":false,"value":null,)"
+                                 R"("duration_ms":D,"exit_code":4,"error":"RunRxStop failed in )"),
+                      ::testing::EndsWith("\\\"\"}\n")));
+    EXPECT_THAT(err(), IsOneLineWith("RunRxStop failed in the transport"));
+}
+
+TEST_F(ClientTest, JsonOfATextThatIsNotUtf8AddsItsBytes) {
+    mService->text = "a\xFF\x01";
+    EXPECT_EQ(run({"--json", "RunRxStop", "6"}), 0);
+    EXPECT_EQ(withoutDuration(out()),
+              R"({"schema_version":1,"method":"RunRxStop","arguments":{"channel":"6"},"ok":true,)"
+              "\"value\":\"a\uFFFD\\u0001\",\"value_hex\":\"61ff01\","
+              R"("duration_ms":D,"exit_code":0})"
+              "\n");
+}
+
+TEST_F(ClientTest, JsonOfALargeTextIsOneLine) {
+    mService->text = std::string(300 * 1024, '\n');
+    EXPECT_EQ(run({"--json", "RunRxStop", "6"}), 0);
+    const std::string json = out();
+    EXPECT_EQ(std::count(json.begin(), json.end(), '\n'), 1);
+    EXPECT_EQ(std::count(json.begin(), json.end(), '\\'), 300 * 1024);
+}
+
+TEST_F(ClientTest, ListsAndExplainsWithoutTheService) {
+    const std::pair<Words, std::string> cases[] = {
+            {{"list"}, listText()},
+            {{"list", "--json"}, listJson()},
+            {{"--help"}, helpText()},
+            {{"list", "--help"}, helpText()},
+            {{"RunTxStop", "--help"}, helpText(*findCommand("RunTxStop"))},
+            {{"--help", "RunRxStop", "6", "7"}, helpText(*findCommand("RunRxStop"))},
+    };
+    for (const auto& [arguments, text] : cases) {
+        mOut.str("");
+        EXPECT_EQ(run(arguments), 0);
+        EXPECT_EQ(out(), text);
+    }
+    EXPECT_EQ(err(), "");
+    EXPECT_EQ(mTried + mAwaited, 0);
+}
+
+// A stream whose device is full.
+class FullBuffer : public std::streambuf {
+    int overflow(int) override {
+        errno = ENOSPC;
+        return traits_type::eof();
+    }
+};
+
+TEST_F(ClientTest, ExitCode6WhenTheResultCannotBeWritten) {
+    mService->number = -1;
+    for (const Words& arguments : {Words{"RunTxStop", "6"}, Words{"RunTxStop", "6", "--json"},
+                                   Words{"list"}, Words{"--help"}}) {
+        mErr.str("");
+        FullBuffer full;
+        std::ostream out(&full);
+        EXPECT_EQ(runClient(arguments, {out, mErr, mTryFind, mAwaitFind}), 6);
+        EXPECT_EQ(err(),
+                  "bex-wifi-client: cannot write the result to stdout: No space left on device\n");
+    }
+}
+
+// Opens a gate as soon as a text has been written and flushed.
+class WatchedBuffer : public std::stringbuf {
+  public:
+    WatchedBuffer(std::string text, std::promise<void>* gate)
+          : mText(std::move(text)), mGate(gate) {}
+
+  private:
+    int sync() override {
+        if (mGate != nullptr && str().find(mText) != std::string::npos) {
+            mGate->set_value();
+            mGate = nullptr;
+        }
+        return 0;
+    }
+
+    const std::string mText;
+    std::promise<void>* mGate;
+};
+
+TEST_F(ClientTest, ATerminalShowsTheSecondsInPlaceAndErasesThemBeforeTheResult) {
+    std::promise<void> release;
+    mService->onCall = [gate = release.get_future().share()] { gate.wait(); };
+    WatchedBuffer buffer(": 3 s", &release);
+    std::ostream screen(&buffer); // Both streams, as a terminal shows them.
+    EXPECT_EQ(runClient({"RunTxStop", "6"}, {screen, screen, mTryFind, mAwaitFind, true, 50ms}), 0);
+    EXPECT_THAT(buffer.str(), ::testing::MatchesRegex("\rRunTxStop: 1 s\rRunTxStop: 2 s"
+                                                      "\rRunTxStop: 3 s(\rRunTxStop: [0-9]+ s)*"
+                                                      "\r {14,}\r0\n"));
+}
+
+TEST_F(ClientTest, ATerminalShowsNothingOfAShortCall) {
+    mTerminal = true;
+    mSecond = 1h;
+    EXPECT_EQ(run({"RunTxStop", "6"}), 0);
+    EXPECT_EQ(err(), "");
+}
+
+TEST_F(ClientTest, WithoutATerminalASlowCallShowsNothing) {
+    mSecond = 1ms;
+    mService->onCall = [] { std::this_thread::sleep_for(50ms); }; // Fifty of these seconds.
+    EXPECT_EQ(run({"RunTxStop", "6"}), 0);
+    EXPECT_EQ(out(), "0\n");
+    EXPECT_EQ(err(), "");
+}
+
+} // namespace
+} // namespace vendor::korvan::bex::wifi::client
