@@ -10,12 +10,12 @@
 namespace recorder {
 
 /**
- * Stands in for the shell and the log of a whole process: what the process would run is written down
- * and answered as told, and nothing runs.
+ * Stands in for the shell and the log of a whole process: what the process would run is written
+ * down and answered as told, and nothing runs.
  *
- * A program that links this library has popen, pclose and __android_log_print of its own in front of
- * the C library's and liblog's. They act on the one RecordedShell alive; while there is none, popen
- * fails and log lines are dropped. Safe to use from several threads.
+ * A program that links this library has popen, pclose and __android_log_print of its own in front
+ * of the C library's and liblog's. They act on the one RecordedShell alive; while there is none,
+ * popen fails and log lines are dropped. Safe to use from several threads.
  *
  *     RecordedShell shell;
  *     shell.answer("wl counters", {"pktengrxdmcast 12\n"});
@@ -50,8 +50,8 @@ class RecordedShell {
     RecordedShell& operator=(const RecordedShell&) = delete;
 
     /**
-     * Sets the answer of every line that contains `part`; the rule set last wins. Lines that no rule
-     * matches print nothing and succeed.
+     * Sets the answer of every line that contains `part`; the rule set last wins. Lines that no
+     * rule matches print nothing and succeed.
      */
     void answer(const std::string& part, Answer answer);
 

@@ -39,8 +39,8 @@ WifiService::WifiService() {
         snifferTool = new SnifferTool();
     }
     if (vendorTestSuit == nullptr) {
-        __android_log_print(ANDROID_LOG_ERROR, kLifeLogTag,
-                            "func : %s, vendorTestSuit is nullptr!", "WifiService");
+        __android_log_print(ANDROID_LOG_ERROR, kLifeLogTag, "func : %s, vendorTestSuit is nullptr!",
+                            "WifiService");
     }
     if (snifferTool == nullptr) {
         __android_log_print(ANDROID_LOG_ERROR, kLifeLogTag, "func : %s, snifferTool is nullptr!",
@@ -121,8 +121,8 @@ Return<void> WifiService::RunRxBgStart(const hidl_string& channel, const hidl_st
 }
 
 Return<void> WifiService::RunRxNStart(const hidl_string& channel, const hidl_string& bandwidth,
-                                      const hidl_string& rate, bool vht,
-                                      const hidl_string& antenna, RunRxNStart_cb callback) {
+                                      const hidl_string& rate, bool vht, const hidl_string& antenna,
+                                      RunRxNStart_cb callback) {
     std::string out;
     const int status = vendorTestSuit->RunRxNStart(channel, bandwidth, rate, vht, antenna, out);
     return answer("RunRxNStart", status, out, callback);

@@ -19,9 +19,9 @@ struct CommandResult {
 /**
  * Runs one command line in the shell, waits for its end and collects its standard output.
  *
- * Logs under `tag` each piece of output as it arrives (debug; a line of more than 255 bytes comes in
- * several pieces), then the command line with "successful" (debug) or "unsuccessful" (error). A shell
- * that cannot be started is not logged.
+ * Logs under `tag` each piece of output as it arrives (debug; a line of more than 255 bytes comes
+ * in several pieces), then the command line with "successful" (debug) or "unsuccessful" (error). A
+ * shell that cannot be started is not logged.
  *
  *     CommandResult result;
  *     runCommand("wl ver ", "wifi@1.0-example", result);

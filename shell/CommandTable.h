@@ -14,8 +14,8 @@
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 /**
- * One command of a table: up to 25 words, the first empty one ends it. So an empty argument cuts off
- * the words behind it, which is what the tools' users rely on.
+ * One command of a table: up to 25 words, the first empty one ends it. So an empty argument cuts
+ * off the words behind it, which is what the tools' users rely on.
  *
  * Words may hold blanks, quotes and redirections; the shell sees them as they stand. A row does not
  * own its words: a word made for the occasion needs a variable that outlives the run.

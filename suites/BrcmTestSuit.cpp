@@ -26,14 +26,13 @@ constexpr Row kFirmware      = {"echo", "-n", "\"/etc/firmware/fw_bcmdhd.bin\"",
 constexpr Row kStartTx       = {"wl", "pkteng_start", "00:11:22:33:44:55", "tx", "100", "1024", "0"};
 constexpr Row kStopTx        = {"wl", "pkteng_stop", "tx"};
 constexpr Row kStartRx       = {"wl", "pkteng_start", "00:11:22:33:44:55", "rx"};
-// clang-format on
 
 // The chip counts the packets that its packet engine receives as pktengrxdmcast; the listing holds
 // every other counter too.
-constexpr Row kReadCounter = {
-        "wl", "counters",
-        " | busybox grep pktengrxdmcast | busybox awk "
-        R"('{for(i = 1;i <= NF;i++) {if("pktengrxdmcast" == $i) print $(i + 1)} }')"};
+constexpr Row kReadCounter   = {"wl", "counters",
+                                " | busybox grep pktengrxdmcast | busybox awk "
+                                R"('{for(i = 1;i <= NF;i++) {if("pktengrxdmcast" == $i) print $(i + 1)} }')"};
+// clang-format on
 
 /** The band as `wl band` names it. */
 std::string_view bandName(const std::string& channel) {

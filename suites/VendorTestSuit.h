@@ -15,8 +15,8 @@ namespace vendor::korvan::bex::wifi::V1_0::implementation {
  * tools, all of them even when one fails, and returns 0 when every one succeeded, else -1.
  *
  * Arguments are text and go into the command lines unchecked; which forms make sense is told at
- * IWifiService, which of them a family uses at its class. Operations that take `out` leave there the
- * text for the client: a packet count or a status word.
+ * IWifiService, which of them a family uses at its class. Operations that take `out` leave there
+ * the text for the client: a packet count or a status word.
  *
  * A suite has no state of its own that an operation changes, so two threads may run two operations;
  * their commands then interleave on the same radio.
@@ -78,15 +78,16 @@ class VendorTestSuit {
     virtual void runCmdCom(const std::string& cmd, CmdRunResult& result);
 
     /**
-     * Replaces the first `from` in `src` by `to`, again and again from the start, until none is left:
-     * ("a-b-c", "-", " ") gives "a b c". Does not end when `to` contains `from` or `from` is empty.
+     * Replaces the first `from` in `src` by `to`, again and again from the start, until there is
+     * none: ("a-b-c", "-", " ") gives "a b c". Does not end when `to` contains `from` or `from` is
+     * empty.
      */
     virtual std::string replaceSubString(const std::string& src, const std::string& from,
                                          const std::string& to);
 
     /**
-     * Splits at every `sep`. A separator at the end adds no empty piece, one at the start and two in
-     * a row do: ("a  b ", " ") gives "a", "", "b". Does not end when `sep` is empty.
+     * Splits at every `sep`. A separator at the end adds no empty piece, one at the start and two
+     * in a row do: ("a  b ", " ") gives "a", "", "b". Does not end when `sep` is empty.
      */
     virtual std::vector<std::string> splitString(const std::string& str, const std::string& sep);
 

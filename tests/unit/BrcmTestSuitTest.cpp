@@ -2,7 +2,6 @@
 // SPDX-License-Identifier: Apache-2.0
 
 #include "suites/BrcmTestSuit.h"
-
 #include "tests/unit/Expect.h"
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
@@ -345,9 +344,12 @@ TEST_F(BrcmTestSuitTest, AStartHandsOverTheCountAlsoBehindAFailure) {
 
 TEST_F(BrcmTestSuitTest, TheCountIsWhatTheCounterCommandPrints) {
     const std::pair<const char*, const char*> cases[] = {
-            {"123\n", "123"},          {"", ""},
-            {"1\n2\n", "12"},          {"pktengrxdmcast 4\n", " 4"},
-            {"no number\n", "no number"}, {"pkteng\nrxdmcast5\n", "5"},
+            {"123\n", "123"},
+            {"", ""},
+            {"1\n2\n", "12"},
+            {"pktengrxdmcast 4\n", " 4"},
+            {"no number\n", "no number"},
+            {"pkteng\nrxdmcast5\n", "5"},
     };
     for (const auto& [output, count] : cases) {
         mShell.answer("counters", {output});

@@ -1,9 +1,9 @@
 // Copyright 2026 The BEX Wi-Fi Authors
 // SPDX-License-Identifier: Apache-2.0
 
-#include "suites/Channel.h"
-
 #include <gtest/gtest.h>
+
+#include "suites/Channel.h"
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 namespace {

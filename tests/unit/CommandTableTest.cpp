@@ -2,7 +2,6 @@
 // SPDX-License-Identifier: Apache-2.0
 
 #include "shell/CommandTable.h"
-
 #include "tests/unit/Expect.h"
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
@@ -13,7 +12,8 @@ TEST(CommandLineTest, PutsABlankBehindEveryWord) {
 }
 
 TEST(CommandLineTest, NeitherQuotesNorSplitsWords) {
-    EXPECT_EQ("echo -n \"/a b\" > f  | x ", commandLine({"echo", "-n", "\"/a b\"", ">", "f", " | x"}));
+    EXPECT_EQ("echo -n \"/a b\" > f  | x ",
+              commandLine({"echo", "-n", "\"/a b\"", ">", "f", " | x"}));
 }
 
 TEST(CommandLineTest, EndsAtTheFirstEmptyWord) {

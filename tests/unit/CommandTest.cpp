@@ -1,10 +1,9 @@
 // Copyright 2026 The BEX Wi-Fi Authors
 // SPDX-License-Identifier: Apache-2.0
 
-#include "shell/Command.h"
-
 #include <signal.h>
 
+#include "shell/Command.h"
 #include "tests/unit/Expect.h"
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {

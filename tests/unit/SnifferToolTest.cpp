@@ -2,7 +2,6 @@
 // SPDX-License-Identifier: Apache-2.0
 
 #include "sniffer/SnifferTool.h"
-
 #include "tests/unit/Expect.h"
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
@@ -20,7 +19,8 @@ class SnifferToolTest : public ::testing::Test {
 
 TEST_F(SnifferToolTest, LogsItsLife) {
     { const SnifferTool tool; }
-    EXPECT_THAT(mShell.log(), ElementsAre(debug(kTag, "SnifferTool "), debug(kTag, "~SnifferTool ")));
+    EXPECT_THAT(mShell.log(),
+                ElementsAre(debug(kTag, "SnifferTool "), debug(kTag, "~SnifferTool ")));
 }
 
 // clang-format off
@@ -83,17 +83,20 @@ TEST_F(SnifferToolTest, AFailedLineStopsNothingAndGivesMinusOne) {
 TEST_F(SnifferToolTest, ReadsTheModeFile) {
     mShell.answer("con_mode", {"4\n"});
     EXPECT_TRUE(mTool.isSnifferMode());
-    EXPECT_THAT(mShell.lines(), ElementsAre("/vendor/bin/cat /sys/module/wlan/parameters/con_mode "));
-    const auto read = ElementsAre(
-            debug(kTag, "4\n"),
-            debug(kTag, "cmd: \"/vendor/bin/cat /sys/module/wlan/parameters/con_mode \" successful "
-                        "execution"),
-            debug(kTag, "wlan con_mode value is : 4\n , atoi() is 4"));
+    EXPECT_THAT(mShell.lines(),
+                ElementsAre("/vendor/bin/cat /sys/module/wlan/parameters/con_mode "));
+    const auto read = ElementsAre(debug(kTag, "4\n"),
+                                  debug(kTag,
+                                        "cmd: \"/vendor/bin/cat "
+                                        "/sys/module/wlan/parameters/con_mode \" successful "
+                                        "execution"),
+                                  debug(kTag, "wlan con_mode value is : 4\n , atoi() is 4"));
     EXPECT_THAT(mShell.log(), read);
 
     mShell.clear();
     EXPECT_EQ(4, mTool.getWlanMode());
-    EXPECT_THAT(mShell.lines(), ElementsAre("/vendor/bin/cat /sys/module/wlan/parameters/con_mode "));
+    EXPECT_THAT(mShell.lines(),
+                ElementsAre("/vendor/bin/cat /sys/module/wlan/parameters/con_mode "));
     EXPECT_THAT(mShell.log(), read);
 }
 

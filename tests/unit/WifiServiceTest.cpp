@@ -1,13 +1,12 @@
 // Copyright 2026 The BEX Wi-Fi Authors
 // SPDX-License-Identifier: Apache-2.0
 
-#include "service/WifiService.h"
-
 #include <android-base/properties.h>
 
 #include <functional>
 #include <typeinfo>
 
+#include "service/WifiService.h"
 #include "suites/BrcmTestSuit.h"
 #include "tests/unit/Expect.h"
 
@@ -55,12 +54,11 @@ TEST(WifiServiceChoiceTest, UnknownVendorsGetNothing) {
             EXPECT_EQ(nullptr, vendorTestSuit) << vendor;
             EXPECT_EQ(nullptr, snifferTool) << vendor;
         }
-        EXPECT_THAT(
-                phone.shell.log(),
-                ElementsAre(error(kLifeTag, "func : WifiService, vendorTestSuit is nullptr!"),
-                            error(kLifeTag, "func : WifiService, snifferTool is nullptr!"),
-                            debug(kLifeTag, "function at: WifiService"),
-                            debug(kLifeTag, "function at: ~WifiService")))
+        EXPECT_THAT(phone.shell.log(),
+                    ElementsAre(error(kLifeTag, "func : WifiService, vendorTestSuit is nullptr!"),
+                                error(kLifeTag, "func : WifiService, snifferTool is nullptr!"),
+                                debug(kLifeTag, "function at: WifiService"),
+                                debug(kLifeTag, "function at: ~WifiService")))
                 << vendor;
     }
 }
@@ -190,7 +188,8 @@ TEST_P(WifiServiceReceptionTest, LogsAFailureAndAnswersAllTheSame) {
     mSuit->mStatus = -1;
     EXPECT_THAT(receive(), ElementsAre(""));
     EXPECT_THAT(mPhone.shell.log(),
-                ElementsAre(error("wifi@1.0-impl", std::string("function at: ") + GetParam().name)));
+                ElementsAre(
+                        error("wifi@1.0-impl", std::string("function at: ") + GetParam().name)));
 }
 
 TEST_P(WifiServiceReceptionTest, KeepsEveryByteOfTheText) {
@@ -216,7 +215,8 @@ INSTANTIATE_TEST_SUITE_P(
                 Reception{"RunRxAxStart",
                           [](auto& s, auto cb) { (void)s.RunRxAxStart("1", "2", "3", "4", cb); },
                           {"RunRxAxStart", "1", "2", "3", "4"}},
-                Reception{"RunRxStop", [](auto& s, auto cb) { (void)s.RunRxStop("1", cb); },
+                Reception{"RunRxStop",
+                          [](auto& s, auto cb) { (void)s.RunRxStop("1", cb); },
                           {"RunRxStop", "1"}}),
         [](const auto& reception) { return std::string(reception.param.name); });
 
