@@ -4,17 +4,29 @@
 #include "recorder/RecordedShell.h"
 
 #include <android/log.h>
+#include <dirent.h>
+#include <dlfcn.h>
 #include <errno.h>
 #include <stdarg.h>
 #include <stdio.h>
+#include <unistd.h>
 
 #include <map>
+#include <memory>
 #include <mutex>
 #include <ostream>
+#include <set>
 
 namespace recorder {
 
 namespace {
+
+/** A directory that is being read; stands behind the DIR* that the reader holds. */
+struct Listing {
+    std::vector<std::string> names;
+    size_t next = 0;
+    dirent entry = {};
+};
 
 // The C functions below have no object to act on, so the recording is the process's.
 struct Recording {
@@ -24,6 +36,10 @@ struct Recording {
     std::vector<RecordedShell::LogLine> log;
     // Running commands: each stream reads from the text beside it.
     std::map<FILE*, RecordedShell::Answer> running;
+    std::set<std::string> readable;
+    std::vector<std::string> probed;
+    std::map<std::string, std::vector<std::string>> directories;
+    std::map<DIR*, std::unique_ptr<Listing>> reading;
 };
 
 std::mutex gMutex;
@@ -63,6 +79,54 @@ int finish(FILE* stream) {
     return status;
 }
 
+/** The function of the C library that `ours` stands in front of. */
+template <typename Function>
+Function* original(const char* name, Function* /*ours*/) {
+    return reinterpret_cast<Function*>(dlsym(RTLD_NEXT, name));
+}
+
+int probe(const char* path, int mode) {
+    const std::lock_guard lock(gMutex);
+    if (!gRecording.on) return original("access", &access)(path, mode);
+    gRecording.probed.push_back(path);
+    if (mode == R_OK && gRecording.readable.count(path) != 0) return 0;
+    errno = ENOENT;
+    return -1;
+}
+
+DIR* openDirectory(const char* path) {
+    const std::lock_guard lock(gMutex);
+    if (!gRecording.on) return original("opendir", &opendir)(path);
+    const auto found = gRecording.directories.find(path);
+    if (found == gRecording.directories.end()) {
+        errno = ENOENT;
+        return nullptr;
+    }
+    auto listing = std::make_unique<Listing>();
+    listing->names = found->second;
+    DIR* directory = reinterpret_cast<DIR*>(listing.get());
+    gRecording.reading[directory] = std::move(listing);
+    return directory;
+}
+
+dirent* nextEntry(DIR* directory) {
+    const std::lock_guard lock(gMutex);
+    const auto found = gRecording.reading.find(directory);
+    if (found == gRecording.reading.end()) return original("readdir", &readdir)(directory);
+    Listing& listing = *found->second;
+    if (listing.next == listing.names.size()) return nullptr;
+    dirent& entry = listing.entry;
+    const std::string& name = listing.names[listing.next++];
+    entry.d_name[name.copy(entry.d_name, sizeof(entry.d_name) - 1)] = '\0';
+    return &entry;
+}
+
+int closeDirectory(DIR* directory) {
+    const std::lock_guard lock(gMutex);
+    if (gRecording.reading.erase(directory) != 0) return 0;
+    return original("closedir", &closedir)(directory);
+}
+
 } // namespace
 
 bool RecordedShell::LogLine::operator==(const LogLine& other) const {
@@ -83,6 +147,26 @@ RecordedShell::~RecordedShell() {
 void RecordedShell::answer(const std::string& part, Answer answer) {
     const std::lock_guard lock(gMutex);
     gRecording.answers.emplace_back(part, std::move(answer));
+}
+
+void RecordedShell::readable(const std::string& path) {
+    const std::lock_guard lock(gMutex);
+    gRecording.readable.insert(path);
+}
+
+void RecordedShell::unreadable(const std::string& path) {
+    const std::lock_guard lock(gMutex);
+    gRecording.readable.erase(path);
+}
+
+void RecordedShell::directory(const std::string& path, std::vector<std::string> names) {
+    const std::lock_guard lock(gMutex);
+    gRecording.directories[path] = std::move(names);
+}
+
+std::vector<std::string> RecordedShell::probed() const {
+    const std::lock_guard lock(gMutex);
+    return gRecording.probed;
 }
 
 std::vector<std::string> RecordedShell::lines() const {
@@ -106,6 +190,7 @@ std::vector<RecordedShell::LogLine> RecordedShell::log(const std::string& tag) c
 void RecordedShell::clear() {
     const std::lock_guard lock(gMutex);
     gRecording.lines.clear();
+    gRecording.probed.clear();
     gRecording.log.clear();
 }
 
@@ -127,6 +212,22 @@ FILE* popen(const char* line, const char* mode) {
 
 int pclose(FILE* stream) {
     return recorder::finish(stream);
+}
+
+int access(const char* path, int mode) noexcept {
+    return recorder::probe(path, mode);
+}
+
+DIR* opendir(const char* path) {
+    return recorder::openDirectory(path);
+}
+
+dirent* readdir(DIR* directory) {
+    return recorder::nextEntry(directory);
+}
+
+int closedir(DIR* directory) {
+    return recorder::closeDirectory(directory);
 }
 
 int __android_log_print(int priority, const char* tag, const char* format, ...) {

@@ -10,15 +10,17 @@
 namespace recorder {
 
 /**
- * Stands in for the shell and the log of a whole process: what the process would run is written
- * down and answered as told, and nothing runs.
+ * Stands in for the shell, the log and the files of a whole process: what the process would run is
+ * written down and answered as told, and nothing runs; the files that it looks for are those told.
  *
- * A program that links this library has popen, pclose and __android_log_print of its own in front
- * of the C library's and liblog's. They act on the one RecordedShell alive; while there is none,
- * popen fails and log lines are dropped. Safe to use from several threads.
+ * A program that links this library has popen, pclose, access, opendir, readdir, closedir and
+ * __android_log_print of its own in front of the C library's and liblog's. They act on the one
+ * RecordedShell alive. While there is none, popen fails, log lines are dropped and the file
+ * functions are the C library's. Safe to use from several threads.
  *
  *     RecordedShell shell;
  *     shell.answer("wl counters", {"pktengrxdmcast 12\n"});
+ *     shell.readable("/vendor/lib/modules/wlan.ko");
  *     suite.RunRxStop("6", out);
  *     EXPECT_THAT(shell.lines(), ElementsAre(...));
  */
@@ -55,6 +57,18 @@ class RecordedShell {
      */
     void answer(const std::string& part, Answer answer);
 
+    /** Lets access find a file that can be read; it finds no other one and knows no other right. */
+    void readable(const std::string& path);
+
+    /** Lets access find the file no longer. */
+    void unreadable(const std::string& path);
+
+    /** Lets opendir open a directory with these entries, in this order; it opens no other one. */
+    void directory(const std::string& path, std::vector<std::string> names);
+
+    /** The files that access was asked for, in order. */
+    std::vector<std::string> probed() const;
+
     /** The command lines that were run, in order. */
     std::vector<std::string> lines() const;
 
@@ -64,7 +78,7 @@ class RecordedShell {
     /** The log lines of one tag, in order. */
     std::vector<LogLine> log(const std::string& tag) const;
 
-    /** Forgets what was run and logged, and keeps the answers. */
+    /** Forgets what was run, logged and probed, and keeps the answers and the files. */
     void clear();
 };
 

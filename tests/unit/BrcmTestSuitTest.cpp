@@ -23,21 +23,6 @@ class BrcmTestSuitTest : public ::testing::Test {
         return found;
     }
 
-    /** Every line of `operation` fails once, and the others still run and give `failed`. */
-    template <typename Operation>
-    void failEachLine(Operation operation, int failed = -1) {
-        mShell.clear();
-        ASSERT_EQ(0, operation());
-        const std::vector<std::string> lines = mShell.lines();
-        for (const std::string& line : lines) {
-            mShell.clear();
-            mShell.answer(line, failing());
-            EXPECT_EQ(failed, operation()) << line;
-            EXPECT_EQ(lines, mShell.lines()) << line;
-            mShell.answer(line, {});
-        }
-    }
-
     RecordedShell mShell;
     BrcmTestSuit mSuit;
     std::string mOut = "left over";
@@ -303,17 +288,17 @@ TEST_F(BrcmTestSuitTest, ArgumentsReachTheShellAsTheyStand) {
 }
 
 TEST_F(BrcmTestSuitTest, AFailedLineStopsNothingAndGivesMinusOne) {
-    failEachLine([&] { return mSuit.RunTxBGStart("6", "54", "15", "1"); });
-    failEachLine([&] { return mSuit.RunTxNStart("36", "80", "9", "12", true, "3"); });
-    failEachLine([&] { return mSuit.RunTxAxStart("", "", "", "", "", ""); });
-    failEachLine([&] { return mSuit.RunTxStStart("6", "", "1"); });
-    failEachLine([&] { return mSuit.RunTxStStop("6"); });
-    failEachLine([&] { return mSuit.RunTxStop("6"); });
-    failEachLine([&] { return mSuit.RunRxApJoinHoc("ap", "192.168.1.7"); });
-    failEachLine([&] { return mSuit.RunRxBgStart("6", "", "1", mOut); });
-    failEachLine([&] { return mSuit.RunRxNStart("6", "20", "", false, "1", mOut); });
-    failEachLine([&] { return mSuit.RunRxAxStart("", "", "", "", mOut); });
-    failEachLine([&] { return mSuit.RunStopDriver(); });
+    failEachLine(mShell, [&] { return mSuit.RunTxBGStart("6", "54", "15", "1"); });
+    failEachLine(mShell, [&] { return mSuit.RunTxNStart("36", "80", "9", "12", true, "3"); });
+    failEachLine(mShell, [&] { return mSuit.RunTxAxStart("", "", "", "", "", ""); });
+    failEachLine(mShell, [&] { return mSuit.RunTxStStart("6", "", "1"); });
+    failEachLine(mShell, [&] { return mSuit.RunTxStStop("6"); });
+    failEachLine(mShell, [&] { return mSuit.RunTxStop("6"); });
+    failEachLine(mShell, [&] { return mSuit.RunRxApJoinHoc("ap", "192.168.1.7"); });
+    failEachLine(mShell, [&] { return mSuit.RunRxBgStart("6", "", "1", mOut); });
+    failEachLine(mShell, [&] { return mSuit.RunRxNStart("6", "20", "", false, "1", mOut); });
+    failEachLine(mShell, [&] { return mSuit.RunRxAxStart("", "", "", "", mOut); });
+    failEachLine(mShell, [&] { return mSuit.RunStopDriver(); });
 }
 
 TEST_F(BrcmTestSuitTest, TheReceptionStopAnswersForItsCounterAlone) {
