@@ -7,6 +7,7 @@
 #include <stdlib.h>
 
 #include "suites/Channel.h"
+#include "suites/Reception.h"
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
@@ -31,7 +32,8 @@ constexpr Row kStartRx       = {"wl", "pkteng_start", "00:11:22:33:44:55", "rx"}
 // every other counter too.
 constexpr Row kReadCounter   = {"wl", "counters",
                                 " | busybox grep pktengrxdmcast | busybox awk "
-                                R"('{for(i = 1;i <= NF;i++) {if("pktengrxdmcast" == $i) print $(i + 1)} }')"};
+                                R"('{for(i = 1;i <= NF;i++) {if("pktengrxdmcast" == $i) )"
+                                "print $(i + 1)} }'"};
 // clang-format on
 
 /** The band as `wl band` names it. */
@@ -184,7 +186,7 @@ int BrcmTestSuit::RunRxAxStart(const std::string&, const std::string&, const std
         {"wl", "phy_watchdog", "0"},
         {"wl", "up"},
     });
-    out = status == 0 ? "ok" : "failure";
+    out = startWord(status);
     return status;
 }
 
@@ -229,7 +231,7 @@ int BrcmTestSuit::startReception(const Row& setChannel, const std::string& chann
 // clang-format on
 
 std::string BrcmTestSuit::packetCount(const std::string& output) {
-    return replaceSubString(replaceSubString(output, "\n", ""), "pktengrxdmcast", "");
+    return countWithout(*this, "pktengrxdmcast", output);
 }
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

@@ -13,4 +13,10 @@ namespace vendor::korvan::bex::wifi::V1_0::implementation {
  */
 bool is5GHz(const std::string& channel);
 
+/**
+ * The centre frequency of a channel in MHz, in decimal: "2437" for channel "6". Numbers below 1,
+ * and text that is no number, give channel 1's.
+ */
+std::string centreFrequency(const std::string& channel);
+
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

@@ -91,7 +91,6 @@ class VendorTestSuit {
      */
     virtual std::vector<std::string> splitString(const std::string& str, const std::string& sep);
 
-  protected:
     /** Runs a table through runCmdCom; `result` is the last command's afterwards. */
     int runTable(const Table& table, CmdRunResult& result);
 

@@ -17,5 +17,18 @@ TEST(ChannelTest, FifteenAndAboveAre5GHz) {
     }
 }
 
+TEST(ChannelTest, CentreFrequencies) {
+    const std::pair<const char*, const char*> cases[] = {
+            {"1", "2412"},   {"2", "2417"},   {"6", "2437"},    {"11", "2462"},
+            {"13", "2472"},  {"14", "2484"},  {"15", "5075"},   {"36", "5180"},
+            {"149", "5745"}, {"165", "5825"}, {"0", "2412"},    {"-1", "2412"},
+            {"-36", "2412"}, {"", "2412"},    {"abc", "2412"},  {"6x", "2437"},
+            {" 36", "5180"}, {"014", "2484"}, {"13.9", "2472"}, {"2147483647", "10737423235"},
+    };
+    for (const auto& [channel, frequency] : cases) {
+        EXPECT_EQ(frequency, centreFrequency(channel)) << channel;
+    }
+}
+
 } // namespace
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation
