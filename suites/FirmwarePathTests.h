@@ -1,0 +1,103 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#pragma once
+
+#include <string>
+#include <string_view>
+
+#include "suites/VendorTestSuit.h"
+
+namespace vendor::korvan::bex::wifi::V1_0::implementation {
+
+/** The tools of a phone, as its shell finds them. */
+struct FirmwarePathTools {
+    std::string_view myftm, rmmod, insmod, sleep, ifconfig, iwlist, iwconfig, ping;
+};
+
+/** How the driver's module is loaded. */
+enum class DriverLoad {
+    Normal,
+    /** In factory test mode, by a parameter of the module. */
+    TestMode,
+    /** Normally; the interface comes up, and then the running driver is switched to test mode. */
+    ThenTestMode,
+};
+
+/** What an 802.11b/g transmission is told, in the words of myftm. */
+struct BgTransmission {
+    std::string antenna, frequency, rateIndex, protocolIndex, power;
+};
+
+/** What tells one chip family from another whose driver is one module file. */
+struct FirmwarePathChip {
+    FirmwarePathTools tools;
+    /** How the driver is loaded for a test. A b/g reception has it ThenTestMode on every chip. */
+    DriverLoad testLoad;
+    /** How it is loaded for joining a network and for 802.11ax, where no test command follows. */
+    DriverLoad idleLoad;
+    /** What ends the running test before an 802.11b/g transmission, and that one's options. */
+    std::string_view bgEnd;
+    Row (*bgOptions)(const BgTransmission& test);
+    /** The option in front of the antenna in an 802.11n transmission. */
+    std::string_view nAntenna;
+    /** What follows the address when joining a network; empty: nothing. */
+    std::string_view addressUp;
+};
+
+// What each chip has there stands side by side in FirmwarePathTests.cpp.
+extern const FirmwarePathChip kQcaChip;
+extern const FirmwarePathChip kWcn39xxChip;
+
+/**
+ * The radio tests of chips whose driver is one module file, through the myftm tool: a start reloads
+ * the driver in factory test mode and runs one myftm command, a stop reloads it normally.
+ *
+ * Runs everything through the suite that owns it, which has operations of the same names. myftm has
+ * two commands that end what runs: -t 0 is for transmissions, -x 0 for receptions.
+ */
+class FirmwarePathTests {
+  public:
+    /**
+     * @param suit The suite that owns this object.
+     * @param tag The suite's log tag.
+     * @param chip Lives for the whole process.
+     * @param fwPath The driver's module file; empty while there is none, which ends the command
+     * that should load it. Outlives this object.
+     */
+    FirmwarePathTests(VendorTestSuit& suit, const char* tag, const FirmwarePathChip& chip,
+                      const std::string& fwPath);
+
+    int RunTxBGStart(const std::string& channel, const std::string& rate, const std::string& power,
+                     const std::string& antenna);
+    int RunTxNStart(const std::string& channel, const std::string& bandwidth,
+                    const std::string& mcs, const std::string& power, bool vht,
+                    const std::string& antenna);
+    int RunTxAxStart();
+    int RunTxStStart(const std::string& channel, const std::string& antenna);
+    int RunTxStop();
+    int RunRxApJoinHoc(const std::string& ssid, const std::string& address);
+    int RunRxBgStart(const std::string& channel, const std::string& rate,
+                     const std::string& antenna, std::string& out);
+    int RunRxNStart(const std::string& channel, const std::string& bandwidth,
+                    const std::string& mcs, bool vht, const std::string& antenna, std::string& out);
+    int RunRxAxStart(std::string& out);
+    int RunRxStop(std::string& out);
+
+    /** The packet count in what the stop of a reception printed, newlines turned into blanks. */
+    std::string parseReceivedPacketNum(const std::string& output);
+
+  private:
+    /** The row of a myftm command. */
+    Row myftm(const Row& options) const;
+
+    /** Ends the running test, loads the driver afresh and runs the rows behind that. */
+    int run(std::string_view end, DriverLoad load, const Table& rows);
+
+    VendorTestSuit& mSuit;
+    const char* const mTag;
+    const FirmwarePathChip& mChip;
+    const std::string& mFwPath;
+};
+
+} // namespace vendor::korvan::bex::wifi::V1_0::implementation
