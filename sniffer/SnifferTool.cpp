@@ -35,22 +35,38 @@ SnifferTool::~SnifferTool() {
 
 // clang-format off
 
+const SnifferTool::CaptureServices SnifferTool::kByProperties = {
+    /* stopTcpdump  */ {"setprop vendor.hardware.wlan.runtcpdump stop"},
+    /* startSniffer */ {"setprop vendor.hardware.wlan.runsniffer start"},
+    /* stopSniffer  */ {"setprop vendor.hardware.wlan.runsniffer stop"},
+    /* startTcpdump */ {"setprop vendor.hardware.wlan.runtcpdump start"},
+};
+
 int SnifferTool::snifferStart(const std::string& channel, const std::string& bandwidth) {
-    return runTable({
-        {"setprop vendor.hardware.wlan.runtcpdump stop"},
-        {"echo 4", ">", kModeFile},
-        {"/vendor/bin/ifconfig", "wlan0", "up"},
-        {"/vendor/bin/iw wlan0 set channel", channel, htMode(channel, bandwidth)},
-        {"setprop vendor.hardware.wlan.runsniffer start"},
-    });
+    return enterMonitorMode(kByProperties,
+        {"/vendor/bin/iw wlan0 set channel", channel, htMode(channel, bandwidth)});
 }
 
 int SnifferTool::snifferStop() {
+    return leaveMonitorMode(kByProperties);
+}
+
+int SnifferTool::enterMonitorMode(const CaptureServices& services, const Row& setChannel) {
     return runTable({
-        {"setprop vendor.hardware.wlan.runsniffer stop"},
+        services.stopTcpdump,
+        {"echo 4", ">", kModeFile},
+        {"/vendor/bin/ifconfig", "wlan0", "up"},
+        setChannel,
+        services.startSniffer,
+    });
+}
+
+int SnifferTool::leaveMonitorMode(const CaptureServices& services) {
+    return runTable({
+        services.stopSniffer,
         {"/vendor/bin/ifconfig", "wlan0", "down"},
         {"echo 0", ">", kModeFile},
-        {"setprop vendor.hardware.wlan.runtcpdump start"},
+        services.startTcpdump,
     });
 }
 

@@ -48,10 +48,28 @@ class SnifferTool {
     void runCmdCom(const std::string& cmd, CmdRunResult& result);
 
   protected:
+    /** How the phone's init is told to start and stop its two capture services. */
+    struct CaptureServices {
+        Row stopTcpdump;
+        Row startSniffer;
+        Row stopSniffer;
+        Row startTcpdump;
+    };
+
+    /** By system properties, which init watches. */
+    static const CaptureServices kByProperties;
+
+    /** Enters monitor mode on the channel that the row `setChannel` sets, and starts the capture.
+     */
+    int enterMonitorMode(const CaptureServices& services, const Row& setChannel);
+
+    /** Ends the capture and leaves monitor mode. */
+    int leaveMonitorMode(const CaptureServices& services);
+
+  private:
     /** Runs a table through runCmdCom. */
     int runTable(const Table& table);
 
-  private:
     /** Reads the driver's mode file; an empty text, with an error line, when it cannot be read. */
     std::string readMode(const char* caller);
 };

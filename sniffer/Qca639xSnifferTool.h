@@ -1,0 +1,17 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#pragma once
+
+#include "sniffer/SnifferTool.h"
+
+namespace vendor::korvan::bex::wifi::V1_0::implementation {
+
+/** Monitor mode on chips of the QCA639x family, whose driver sets the channel itself. */
+class Qca639xSnifferTool : public SnifferTool {
+  public:
+    /** See setMonitorChannel for the forms of `channel` and `bandwidth`. */
+    int snifferStart(const std::string& channel, const std::string& bandwidth) override;
+};
+
+} // namespace vendor::korvan::bex::wifi::V1_0::implementation
