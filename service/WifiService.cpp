@@ -6,7 +6,7 @@
 #include <android-base/properties.h>
 #include <android/log.h>
 
-#include "suites/BrcmTestSuit.h"
+#include "service/ChipChoice.h"
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
@@ -34,9 +34,9 @@ SnifferTool* snifferTool = nullptr;
 WifiService::WifiService() {
     const std::string vendor = getWifiVendor();
     const std::string chip = getWifiChip();
-    if (vendor == "broadcom") {
-        vendorTestSuit = new BrcmTestSuit();
-        snifferTool = new SnifferTool();
+    if (const ChipChoice* choice = chooseChip(vendor, chip)) {
+        vendorTestSuit = choice->makeSuit();
+        snifferTool = choice->makeSniffer();
     }
     if (vendorTestSuit == nullptr) {
         __android_log_print(ANDROID_LOG_ERROR, kLifeLogTag, "func : %s, vendorTestSuit is nullptr!",

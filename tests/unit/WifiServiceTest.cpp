@@ -8,6 +8,7 @@
 
 #include "service/WifiService.h"
 #include "suites/BrcmTestSuit.h"
+#include "suites/Wcn39xxTestSuit.h"
 #include "tests/unit/Expect.h"
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
@@ -44,6 +45,33 @@ TEST(WifiServiceChoiceTest, BroadcomPhonesGetTheBroadcomSuite) {
         EXPECT_EQ("broadcom", service->getWifiVendor());
         EXPECT_EQ(chip, service->getWifiChip());
     }
+}
+
+TEST(WifiServiceChoiceTest, QualcommPhonesGetTheSuiteOfTheirChip) {
+    Phone phone("qcom", "wcn6750");
+    { const sp<WifiService> service = new WifiService(); }
+    EXPECT_EQ(nullptr, vendorTestSuit);
+    EXPECT_EQ(nullptr, snifferTool);
+    const std::string tag = "wifi@1.0-Wcn6750TestSuit.wcn6750";
+    EXPECT_THAT(phone.shell.log(),
+                ElementsAre(debug("wifi@1.0-VendorTestSuit", "function at: VendorTestSuit"),
+                            error(tag, "cannot find wlan driver : Wcn6750TestSuit"),
+                            debug(tag, "function at: Wcn6750TestSuit"),
+                            debug("wifi@1.0-SnifferTool", "SnifferTool "),
+                            debug(kLifeTag, "function at: WifiService"),
+                            debug(tag, "function at: ~Wcn6750TestSuit"),
+                            debug("wifi@1.0-VendorTestSuit", "function at: ~VendorTestSuit"),
+                            debug("wifi@1.0-SnifferTool", "~SnifferTool "),
+                            debug(kLifeTag, "function at: ~WifiService")));
+}
+
+TEST(WifiServiceChoiceTest, AQualcommPhoneWithoutChipNameGetsASuiteToo) {
+    const Phone phone("qcom", "");
+    const sp<WifiService> service = new WifiService();
+    ASSERT_NE(nullptr, vendorTestSuit);
+    EXPECT_EQ(typeid(Wcn39xxTestSuit), typeid(*vendorTestSuit));
+    ASSERT_NE(nullptr, snifferTool);
+    EXPECT_EQ(typeid(SnifferTool), typeid(*snifferTool));
 }
 
 TEST(WifiServiceChoiceTest, UnknownVendorsGetNothing) {

@@ -1,0 +1,29 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#pragma once
+
+#include <string>
+
+#include "sniffer/SnifferTool.h"
+#include "suites/VendorTestSuit.h"
+
+namespace vendor::korvan::bex::wifi::V1_0::implementation {
+
+/** What drives a chip: makes the suite and the sniffer controller, which the caller owns. */
+struct ChipChoice {
+    VendorTestSuit* (*makeSuit)();
+    SnifferTool* (*makeSniffer)();
+};
+
+/**
+ * Chooses what drives a phone's chip.
+ *
+ * @param vendor The chip's vendor: exactly "broadcom" or "qcom".
+ * @param chip The chip's name. It tells the families of a vendor apart by a part of it, upper and
+ *     lower case being different; any name, an empty one too, belongs to one.
+ * @return The choice, which lives for the whole process; null when the vendor is unknown.
+ */
+const ChipChoice* chooseChip(const std::string& vendor, const std::string& chip);
+
+} // namespace vendor::korvan::bex::wifi::V1_0::implementation
