@@ -15,6 +15,8 @@ function(hidl_package target)
     # 1/0 -> 1.0: only the version keeps its dot in the path.
     string(REGEX REPLACE "/([0-9]+)/([0-9]+)$" "/\\1.\\2" folder ${folder})
     list(TRANSFORM HIDL_GENERATED PREPEND ${HIDL_OUTPUT}/${folder}/)
+    set(headers ${HIDL_GENERATED})
+    list(FILTER headers INCLUDE REGEX "\\.h$")
 
     # A variable template's specialisation is not implicitly inline, so two units that include the
     # header would both define it; hidl-gen's own compiler let that pass.
@@ -22,8 +24,7 @@ function(hidl_package target)
         OUTPUT ${HIDL_GENERATED}
         COMMAND ${HIDL_GEN} -o ${HIDL_OUTPUT} -L c++-headers ${HIDL_ROOTS} ${HIDL_PACKAGE}
         COMMAND ${HIDL_GEN} -o ${HIDL_OUTPUT} -L c++-sources ${HIDL_ROOTS} ${HIDL_PACKAGE}
-        COMMAND sed -i "s/^template<> constexpr/template<> inline constexpr/"
-                ${HIDL_OUTPUT}/${folder}/*.h
+        COMMAND sed -i "s/^template<> constexpr/template<> inline constexpr/" ${headers}
         DEPENDS ${HIDL_SOURCES}
         COMMENT "Generating ${HIDL_PACKAGE}"
         VERBATIM

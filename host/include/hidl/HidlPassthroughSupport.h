@@ -1,0 +1,6 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#pragma once
+
+#include <hidl/HidlTransportSupport.h>

@@ -1,0 +1,56 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#pragma once
+
+#include <android/hidl/base/1.0/IBase.h>
+#include <hidl/HidlBinderSupport.h>
+#include <hidl/HidlSupport.h>
+#include <hidl/Status.h>
+
+#include <cstddef>
+#include <string>
+
+namespace android::hardware {
+
+/**
+ * Sets how many calls this process serves at a time. Comes before any registration.
+ *
+ * @param maxThreads The number of threads, at least 1.
+ * @param callerWillJoin true when one of them is the caller's, which joinRpcThreadpool() brings in.
+ */
+void configureRpcThreadpool(size_t maxThreads, bool callerWillJoin);
+
+/** Serves calls for ever. Aborts unless configureRpcThreadpool() was called. */
+[[noreturn]] void joinRpcThreadpool();
+
+namespace details {
+
+/** Whether the object implements the interface; a remote one is asked for its interfaceChain(). */
+Return<bool> canCastInterface(hidl::base::V1_0::IBase* interface, const char* name, bool emitError);
+
+/** Process ids and addresses stay private unless the build is debuggable, which it never is here.
+ */
+inline int32_t getPidIfSharable() {
+    return -1;
+}
+inline bool debuggable() {
+    return false;
+}
+
+/** The checked cast behind the generated castFrom(): null when the object is something else. */
+template <typename IChild, typename IParent, typename BpChild>
+Return<sp<IChild>> castInterface(const sp<IParent>& parent, const char* name, bool emitError) {
+    if (parent == nullptr) return sp<IChild>(nullptr);
+    Return<bool> canCast = canCastInterface(parent.get(), name, emitError);
+    if (!canCast.isOk()) {
+        if (emitError) return canCast.propagate();
+        return sp<IChild>(nullptr);
+    }
+    if (!canCast) return sp<IChild>(nullptr);
+    if (parent->isRemote()) return sp<IChild>(new BpChild(toBinder(parent)));
+    return sp<IChild>(static_cast<IChild*>(parent.get()));
+}
+
+} // namespace details
+} // namespace android::hardware

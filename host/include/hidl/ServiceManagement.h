@@ -1,0 +1,56 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#pragma once
+
+#include <android/hidl/base/1.0/IBase.h>
+#include <android/hidl/manager/1.0/IServiceManager.h>
+#include <hidl/HidlTransportSupport.h>
+#include <hidl/Status.h>
+
+#include <string>
+
+namespace android::hardware {
+
+/** There is no service manager on a host, the file system takes its place: always null. */
+sp<hidl::manager::V1_0::IServiceManager> defaultServiceManager();
+
+namespace details {
+
+/**
+ * Makes the object reachable under its interface's name and the instance name. The last
+ * registration of a name wins, also over one by another process.
+ *
+ * @return OK; BAD_VALUE when the name is too long for a socket's path; UNEXPECTED_NULL without an
+ *     object; else why the socket could not be made. Every failure also writes one line to the log.
+ */
+status_t registerAsServiceInternal(const sp<hidl::base::V1_0::IBase>& service,
+                                   const std::string& name);
+
+/** A found object: in this process, or the way to it elsewhere. Neither when there is none. */
+struct RawService {
+    sp<hidl::base::V1_0::IBase> local;
+    sp<IBinder> remote;
+};
+
+/**
+ * Looks up "interface/instance": the same object in the process that registered it, elsewhere the
+ * way to it. Nothing when it is not registered, unless `retry` is set and the VINTF manifest
+ * declares it: then waits until it is, with a line in the log each second.
+ */
+RawService getRawServiceInternal(const std::string& descriptor, const std::string& instance,
+                                 bool retry);
+
+/** The body of the generated getService() and tryGetService(). There are no passthrough objects. */
+template <typename BpType>
+sp<typename BpType::Pure> getServiceInternal(const std::string& instance, bool retry,
+                                             bool getStub) {
+    using IType = typename BpType::Pure;
+    if (getStub) return nullptr;
+    RawService found = getRawServiceInternal(IType::descriptor, instance, retry);
+    if (found.remote != nullptr) return new BpType(found.remote);
+    return sp<IType>(static_cast<IType*>(found.local.get()));
+}
+
+} // namespace details
+} // namespace android::hardware

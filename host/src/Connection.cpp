@@ -1,0 +1,129 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#define LOG_TAG "hidl-host"
+
+#include "host/src/Connection.h"
+
+#include <errno.h>
+#include <log/log.h>
+#include <sys/socket.h>
+#include <unistd.h>
+
+#include <cstring>
+#include <memory>
+#include <utility>
+
+namespace android::hardware::host {
+
+bool isTrustedPeer(int socket) {
+    ucred peer = {};
+    socklen_t size = sizeof(peer);
+    if (getsockopt(socket, SOL_SOCKET, SO_PEERCRED, &peer, &size) != 0) return false;
+    return peer.uid == geteuid() || peer.uid == 0;
+}
+
+void Listener::onReady() {
+    for (;;) {
+        base::unique_fd client(
+                TEMP_FAILURE_RETRY(accept4(socket(), nullptr, nullptr, SOCK_CLOEXEC)));
+        if (!client.ok()) {
+            if (errno == ECONNABORTED) continue;
+            if (errno != EAGAIN) ALOGE("accept: %s", strerror(errno));
+            return;
+        }
+        if (!isTrustedPeer(client.get())) {
+            ALOGW("A client of another user was turned away");
+        } else if (Engine::get().isFull()) {
+            ALOGW("Too many clients, one was turned away");
+        } else {
+            Engine::get().add(std::make_shared<Connection>(std::move(client), mTarget));
+        }
+    }
+}
+
+void Connection::onReady() {
+    if (!own()) return;
+    for (;;) {
+        FrameHeader header;
+        Parcel request;
+        const Receipt receipt = mReader.receive(MSG_DONTWAIT, &header, &request);
+        if (receipt == Receipt::kNothing) {
+            if (disownIfNothingCame()) return;
+            continue;
+        }
+        if (receipt == Receipt::kClosed) return close();
+        if (receipt == Receipt::kMalformed || (header.flags & FrameHeader::kReply) != 0) {
+            ALOGW("A client sent something malformed and was turned away");
+            return close();
+        }
+        const bool oneway = (header.flags & FrameHeader::kOneway) != 0;
+        if (receipt == Receipt::kFrame) {
+            serve(header, &request);
+        } else if (!oneway) {
+            answer(FAILED_TRANSACTION, nullptr);
+        }
+        // The answer gave the connection up; without one it is still this thread's.
+        if (!oneway) return;
+    }
+}
+
+bool Connection::own() {
+    State state = State::kIdle;
+    if (mState.compare_exchange_strong(state, State::kOwned)) return true;
+    // Tells the owner, unless it has just let go, and then there is no owner to tell.
+    while (!mState.compare_exchange_weak(state, state == State::kIdle ? State::kOwned
+                                                                      : State::kOwnedAndReady)) {
+    }
+    return state == State::kIdle;
+}
+
+bool Connection::disownIfNothingCame() {
+    State state = State::kOwned;
+    if (mState.compare_exchange_strong(state, State::kIdle)) return true;
+    mState = State::kOwned;
+    return false;
+}
+
+void Connection::disown() {
+    if (mState.exchange(State::kIdle) == State::kOwnedAndReady) Engine::get().rearm(*this);
+}
+
+void Connection::serve(const FrameHeader& header, Parcel* request) {
+    const bool oneway = (header.flags & FrameHeader::kOneway) != 0;
+    bool answered = oneway;
+    Parcel reply;
+    auto answerOnce = [&](status_t status, const Parcel* result) {
+        if (std::exchange(answered, true)) return;
+        // Before the client can send its next call, which may need the room.
+        ParcelAccess::releaseReservation(request);
+        answer(status, result);
+    };
+    const status_t status = mTarget->transact(header.code, *request, &reply,
+                                              oneway ? uint32_t{IBinder::FLAG_ONEWAY} : 0,
+                                              [&](Parcel& result) { answerOnce(OK, &result); });
+    answerOnce(status, status == OK ? &reply : nullptr);
+}
+
+void Connection::answer(status_t status, const Parcel* reply) {
+    FrameHeader header;
+    header.flags = FrameHeader::kReply;
+    header.status = status;
+    disown();
+    // A client has one call under way, so its socket has room; one that lets it fill is not served.
+    status_t sent = sendFrame(socket(), header, reply, MSG_DONTWAIT);
+    if (sent == FAILED_TRANSACTION) {
+        header.status = FAILED_TRANSACTION;
+        sent = sendFrame(socket(), header, nullptr, MSG_DONTWAIT);
+    }
+    if (sent != OK) close();
+}
+
+void Connection::close() {
+    // Also tells a client that is still there; the descriptor itself may be in another thread's
+    // use.
+    shutdown(socket(), SHUT_RDWR);
+    Engine::get().remove(id());
+}
+
+} // namespace android::hardware::host

@@ -1,0 +1,24 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#pragma once
+
+#include <android-base/unique_fd.h>
+
+#include <chrono>
+
+namespace android::hardware::host {
+
+/** Notices registrations from its making on, so that one made between a look and a wait is not
+ * lost. */
+class RegistrationWatch {
+  public:
+    RegistrationWatch();
+    /** Returns after a registration, or when the time is over: true for the first. */
+    bool wait(std::chrono::milliseconds timeout);
+
+  private:
+    const base::unique_fd mNotices;
+};
+
+} // namespace android::hardware::host

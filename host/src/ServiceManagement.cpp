@@ -1,0 +1,98 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#define LOG_TAG "hidl-host"
+
+#include <hidl/ServiceManagement.h>
+#include <log/log.h>
+
+#include <chrono>
+
+#include "host/src/Engine.h"
+#include "host/src/Manifest.h"
+#include "host/src/RegistrationWatch.h"
+#include "host/src/Registry.h"
+#include "host/src/RemoteBinder.h"
+#include "host/src/SocketFile.h"
+
+namespace android::hardware {
+
+using hidl::base::V1_0::IBase;
+
+void configureRpcThreadpool(size_t maxThreads, bool callerWillJoin) {
+    host::Engine::get().configure(maxThreads, callerWillJoin);
+}
+
+void joinRpcThreadpool() {
+    host::Engine::get().join();
+}
+
+sp<hidl::manager::V1_0::IServiceManager> defaultServiceManager() {
+    return nullptr;
+}
+
+namespace details {
+namespace {
+
+/** What stands behind the name now. */
+RawService lookUp(const std::string& path) {
+    host::FileIdentity identity;
+    if (host::FileIdentity::of(path, &identity) != OK) return {};
+    // Asking its own socket would wait for a thread that may be the caller's.
+    if (sp<IBase> local = host::Registry::get().find(identity); local != nullptr) {
+        return {local, nullptr};
+    }
+    std::unique_ptr<host::Session> session = host::Session::open(path);
+    if (session == nullptr) return {};
+    return {nullptr, new host::RemoteBinder(std::move(session))};
+}
+
+RawService waitFor(const std::string& path, const char* descriptor, const char* instance) {
+    using std::chrono::steady_clock;
+    auto nextLine = steady_clock::now() + std::chrono::seconds(1);
+    for (;;) {
+        host::RegistrationWatch watch;
+        RawService found = lookUp(path);
+        if (found.local != nullptr || found.remote != nullptr) return found;
+        const auto left = nextLine - steady_clock::now();
+        if (!watch.wait(std::chrono::ceil<std::chrono::milliseconds>(left)) &&
+            steady_clock::now() >= nextLine) {
+            ALOGW("Waited one second for %s/%s", descriptor, instance);
+            nextLine += std::chrono::seconds(1);
+        }
+    }
+}
+
+} // namespace
+
+status_t registerAsServiceInternal(const sp<IBase>& service, const std::string& name) {
+    sp<IBinder> binder = toBinder(service);
+    if (binder == nullptr) return UNEXPECTED_NULL;
+    if (binder->localBinder() == nullptr) {
+        ALOGE("Only objects of this process can be registered");
+        return INVALID_OPERATION;
+    }
+    std::string path;
+    Return<void> named = service->interfaceDescriptor(
+            [&](const hidl_string& descriptor) { path = host::socketPath(descriptor, name); });
+    if (!named.isOk()) return UNKNOWN_ERROR;
+    status_t result = host::Registry::get().add(path, service, binder->localBinder());
+    if (result == OK) host::Engine::get().start();
+    return result;
+}
+
+RawService getRawServiceInternal(const std::string& descriptor, const std::string& instance,
+                                 bool retry) {
+    const std::string path = host::socketPath(descriptor, instance);
+    RawService found = lookUp(path);
+    if (found.local != nullptr || found.remote != nullptr || !retry) return found;
+    if (!host::isDeclaredInManifest(descriptor, instance)) {
+        ALOGW("%s/%s is not registered, and the VINTF manifest does not declare it",
+              descriptor.c_str(), instance.c_str());
+        return {};
+    }
+    return waitFor(path, descriptor.c_str(), instance.c_str());
+}
+
+} // namespace details
+} // namespace android::hardware

@@ -1,0 +1,114 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#define LOG_TAG "hidl-host"
+
+#include "host/src/Session.h"
+
+#include <errno.h>
+#include <log/log.h>
+#include <poll.h>
+#include <sys/socket.h>
+
+#include <cstring>
+#include <utility>
+
+#include "host/src/Connection.h"
+
+namespace android::hardware::host {
+namespace {
+
+// More calls of one client than this wait here instead of at the server, which runs fewer at a
+// time.
+constexpr size_t kMaxConnections = 16;
+
+/** Connects to whoever answers at the path, and tells whose socket it is. */
+base::unique_fd connectTo(const std::string& path, FileIdentity* identity) {
+    sockaddr_un address;
+    if (socketAddress(path, &address) != OK) return {};
+    for (;;) {
+        if (FileIdentity::of(path, identity) != OK) return {};
+        base::unique_fd connection(::socket(AF_UNIX, SOCK_SEQPACKET | SOCK_CLOEXEC, 0));
+        if (!connection.ok()) return {};
+        if (TEMP_FAILURE_RETRY(connect(connection.get(), reinterpret_cast<sockaddr*>(&address),
+                                       sizeof(address))) != 0) {
+            if (errno != ECONNREFUSED && errno != ENOENT) {
+                ALOGE("%s: %s", path.c_str(), strerror(errno));
+            }
+            return {};
+        }
+        FileIdentity after;
+        if (FileIdentity::of(path, &after) != OK || !(after == *identity)) continue;
+        if (isTrustedPeer(connection.get())) return connection;
+        ALOGE("%s belongs to another user", path.c_str());
+        return {};
+    }
+}
+
+} // namespace
+
+std::unique_ptr<Session> Session::open(const std::string& path) {
+    FileIdentity identity;
+    base::unique_fd first = connectTo(path, &identity);
+    if (!first.ok()) return nullptr;
+    return std::unique_ptr<Session>(new Session(path, identity, std::move(first)));
+}
+
+Session::Session(const std::string& path, const FileIdentity& identity, base::unique_fd first)
+      : mPath(path), mIdentity(identity) {
+    // first() is read without the lock while others connect.
+    mConnections.reserve(kMaxConnections);
+    mIdle.push_back(first.get());
+    mConnections.push_back(std::move(first));
+}
+
+int Session::acquire() {
+    std::unique_lock<std::mutex> lock(mMutex);
+    for (;;) {
+        if (mDead) return -1;
+        if (!mIdle.empty()) {
+            const int connection = mIdle.back();
+            mIdle.pop_back();
+            return connection;
+        }
+        if (!mMayGrow || mConnecting || mConnections.size() == kMaxConnections) {
+            mChanged.wait(lock);
+            continue;
+        }
+        mConnecting = true;
+        lock.unlock();
+        FileIdentity identity;
+        base::unique_fd added = connectTo(mPath, &identity);
+        lock.lock();
+        mConnecting = false;
+        mChanged.notify_all();
+        // Another incarnation has the name now, so this one can no longer be reached anew.
+        mMayGrow = added.ok() && identity == mIdentity;
+        if (!mMayGrow) continue;
+        const int connection = added.get();
+        mConnections.push_back(std::move(added));
+        return connection;
+    }
+}
+
+void Session::release(int connection) {
+    std::lock_guard<std::mutex> lock(mMutex);
+    mIdle.push_back(connection);
+    mChanged.notify_one();
+}
+
+void Session::markDead() {
+    std::lock_guard<std::mutex> lock(mMutex);
+    mDead = true;
+    shutdown(first(), SHUT_RDWR);
+    mChanged.notify_all();
+}
+
+bool Session::isDead() {
+    pollfd hangup = {first(), POLLRDHUP, 0};
+    if (poll(&hangup, 1, 0) > 0) markDead();
+    std::lock_guard<std::mutex> lock(mMutex);
+    return mDead;
+}
+
+} // namespace android::hardware::host

@@ -1,0 +1,54 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#pragma once
+
+#include <android-base/unique_fd.h>
+
+#include <condition_variable>
+#include <memory>
+#include <mutex>
+#include <string>
+#include <vector>
+
+#include "host/src/SocketFile.h"
+
+namespace android::hardware::host {
+
+/**
+ * A client's connections to one server incarnation: the process, and the registration, that stood
+ * behind the name when the session was opened. It never changes over to another.
+ */
+class Session {
+  public:
+    /** Null when nobody answers at the path. */
+    static std::unique_ptr<Session> open(const std::string& path);
+
+    /** A connection for one call; waits for one when there can be no more. Dead: -1. */
+    int acquire();
+    void release(int connection);
+
+    /** The server is gone: from now on, for ever, and for all the threads. */
+    void markDead();
+    /** Asks the first connection, not the server. */
+    bool isDead();
+
+    /** Hangs up when the session dies; open as long as the session exists. */
+    int first() const { return mConnections.front().get(); }
+
+  private:
+    Session(const std::string& path, const FileIdentity& identity, base::unique_fd first);
+
+    const std::string mPath;
+    const FileIdentity mIdentity;
+
+    std::mutex mMutex;
+    std::condition_variable mChanged;
+    std::vector<base::unique_fd> mConnections;
+    std::vector<int> mIdle;
+    bool mConnecting = false;
+    bool mMayGrow = true;
+    bool mDead = false;
+};
+
+} // namespace android::hardware::host
