@@ -88,7 +88,7 @@ Function* original(const char* name, Function* /*ours*/) {
 int probe(const char* path, int mode) {
     const std::lock_guard lock(gMutex);
     if (!gRecording.on) return original("access", &access)(path, mode);
-    gRecording.probed.push_back(path);
+    gRecording.probed.emplace_back(path);
     if (mode == R_OK && gRecording.readable.count(path) != 0) return 0;
     errno = ENOENT;
     return -1;

@@ -74,7 +74,7 @@ std::string bandwidthMode(const std::string& bandwidth, bool vht) {
 
 std::string bandwidthOption(const std::string& bandwidth, bool vht, const char* tag) {
     const int mhz = atoi(bandwidth.c_str());
-    const std::string option = find(kOptions, mhz, vht);
+    std::string option = find(kOptions, mhz, vht);
     if (!option.empty()) return option;
     __android_log_print(ANDROID_LOG_ERROR, tag, "bandwidth error : %d, use default 20MHz", mhz);
     return byStandard(kOptionOf20MHz, vht);

@@ -79,7 +79,7 @@ TEST_F(ClientTest, PrintsTheFlag) {
 }
 
 TEST_F(ClientTest, PrintsTheTextByteForByte) {
-    mService->text = std::string("\xFF\0\x1B[0m\r\nx ", 9) + std::string(400 * 1024, '\x80');
+    mService->text = std::string("\xFF\0\x1B[0m\r\nx ", 9) + std::string(400'000, '\x80');
     EXPECT_EQ(run({"RunRxStop", "6"}), 0);
     EXPECT_TRUE(out() == mService->text + "\n");
     EXPECT_EQ(err(), "");
@@ -299,11 +299,11 @@ TEST_F(ClientTest, JsonOfATextThatIsNotUtf8AddsItsBytes) {
 }
 
 TEST_F(ClientTest, JsonOfALargeTextIsOneLine) {
-    mService->text = std::string(300 * 1024, '\n');
+    mService->text = std::string(300'000, '\n');
     EXPECT_EQ(run({"--json", "RunRxStop", "6"}), 0);
     const std::string json = out();
     EXPECT_EQ(std::count(json.begin(), json.end(), '\n'), 1);
-    EXPECT_EQ(std::count(json.begin(), json.end(), '\\'), 300 * 1024);
+    EXPECT_EQ(std::count(json.begin(), json.end(), '\\'), 300'000);
 }
 
 TEST_F(ClientTest, ListsAndExplainsWithoutTheService) {

@@ -16,7 +16,7 @@ std::vector<std::string> entries(const char* path) {
     std::vector<std::string> names;
     DIR* directory = opendir(path);
     if (directory == nullptr) return names;
-    while (const dirent* entry = readdir(directory)) names.push_back(entry->d_name);
+    while (const dirent* entry = readdir(directory)) names.emplace_back(entry->d_name);
     EXPECT_EQ(0, closedir(directory));
     return names;
 }

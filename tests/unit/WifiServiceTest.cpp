@@ -4,6 +4,7 @@
 #include <android-base/properties.h>
 
 #include <functional>
+#include <ostream>
 #include <typeinfo>
 
 #include "service/WifiService.h"
@@ -194,6 +195,11 @@ struct Reception {
     std::vector<std::string> arrives;
 };
 
+/** Names the method where GoogleTest shows the parameter. */
+void PrintTo(const Reception& reception, std::ostream* stream) {
+    *stream << reception.name;
+}
+
 class WifiServiceReceptionTest : public WifiServiceTest,
                                  public ::testing::WithParamInterface<Reception> {
   protected:
@@ -249,7 +255,7 @@ INSTANTIATE_TEST_SUITE_P(
         [](const auto& reception) { return std::string(reception.param.name); });
 
 TEST_F(WifiServiceTest, ArgumentsArriveByteForByte) {
-    const std::string odd("a b\"$(x)\0\xff\n", 12);
+    const std::string odd("a b\"$(x)\0\xff\n", 11);
     EXPECT_EQ(0, static_cast<int32_t>(mService->RunRxApJoinHoc(odd, "")));
     EXPECT_THAT(mSuit->mCall, ElementsAre("RunRxApJoinHoc", odd, ""));
 }
