@@ -1,0 +1,138 @@
+# Copyright 2026 The BEX Wi-Fi Authors
+# SPDX-License-Identifier: Apache-2.0
+"""The command line: reads the arguments and calls the module that does the work.
+
+Exit codes: 0 done, 1 failed (one line on stderr), 2 wrong usage. `run` gives the exit code of its
+command, 128 + n when signal n ended it, and 125 when the phone could not be entered.
+
+The modules are imported by the command that needs them: `run` stays quick.
+"""
+
+import os
+import signal
+import sys
+
+from launcher.errors import PhoneError
+
+USAGE = """\
+usage: phone create CHIP DIR [--install SRC=DEST]...   build a phone in the new folder DIR
+       phone up DIR                                    boot it and start its service
+       phone down DIR                                  end everything that runs in it
+       phone restart-service DIR                       kill the service and start it again
+       phone run DIR COMMAND [ARG...]                  run a command in it, up or not
+       phone fault DIR TOOL [--when PATTERN] ACTION... make a tool misbehave; ACTION is one of
+             exit N | signal N | sleep SECONDS | wait | print FILE | missing
+       phone fault DIR TOOL release                    let the tools at a wait go on
+       phone fault DIR TOOL clear                      back to normal
+CHIP is a name in simulator/phones, or the path (with a slash) of a description file.
+"""
+
+
+class UsageError(Exception):
+    """Arguments that fit no command."""
+
+
+def main(arguments):
+    commands = {
+        "create": create,
+        "up": up,
+        "down": down,
+        "restart-service": restart_service,
+        "run": run,
+        "fault": fault,
+    }
+    if arguments in (["--help"], ["-h"], ["help"]):
+        print(USAGE, end="")
+        return 0
+    os.umask(0o022)
+    signal.signal(signal.SIGTERM, signal.default_int_handler)  # a command ended by it cleans up
+    name = arguments[0] if arguments else ""
+    try:
+        if name not in commands:
+            raise UsageError
+        return commands[name](arguments[1:])
+    except UsageError:
+        print(USAGE, end="", file=sys.stderr)
+        return 2
+    except (PhoneError, OSError) as error:
+        if isinstance(error, OSError) and error.filename:
+            error = f"{error.filename}: {error.strerror}"
+        print(f"phone: {error}", file=sys.stderr)
+        return 125 if name == "run" else 1
+    except KeyboardInterrupt:
+        return 130
+
+
+def phone_folder(arguments):
+    """The single argument of up, down and restart-service: an existing phone's folder."""
+    if len(arguments) != 1:
+        raise UsageError
+    return checked_folder(arguments[0])
+
+
+def checked_folder(folder):
+    if not os.path.isdir(os.path.join(folder, "root", "phone")):
+        raise PhoneError(f"{folder} is not a phone (phone create makes one)")
+    if os.stat(os.path.join(folder, "root")).st_uid != os.geteuid():
+        raise PhoneError(f"{folder} belongs to another user")
+    return os.path.realpath(folder)
+
+
+def create(arguments):
+    from launcher import build
+
+    positional, installs = [], []
+    rest = iter(arguments)
+    for argument in rest:
+        if argument == "--install":
+            argument = "--install=" + next(rest, "")
+        if argument.startswith("--install="):
+            installs.append(argument[len("--install="):])
+        elif argument.startswith("-"):
+            raise UsageError
+        else:
+            positional.append(argument)
+    if len(positional) != 2:
+        raise UsageError
+    build.create(*positional, installs)
+    return 0
+
+
+def up(arguments):
+    from launcher import power
+
+    power.up(phone_folder(arguments), boot=True)
+    return 0
+
+
+def down(arguments):
+    from launcher import power
+
+    power.down(phone_folder(arguments))
+    return 0
+
+
+def restart_service(arguments):
+    from launcher import power
+
+    power.restart_service(phone_folder(arguments))
+    return 0
+
+
+def run(arguments):
+    from launcher import sandbox
+
+    if len(arguments) < 2:
+        raise UsageError
+    folder = checked_folder(arguments[0])
+    return sandbox.Sandbox(folder, arguments[1:]).wait()
+
+
+def fault(arguments):
+    from launcher import faults
+
+    if len(arguments) < 3:
+        raise UsageError
+    folder, tool, *actions = arguments
+    faults.stage(checked_folder(folder), tool, actions)
+    return 0
