@@ -1,10 +1,15 @@
 // Copyright 2026 The BEX Wi-Fi Authors
 // SPDX-License-Identifier: Apache-2.0
 
-// Prints the command lines that a call would run, one a line, without running any. The chip is the
-// one that the properties name: on a host, <HIDL_HOST_ROOT>/vendor/build.prop.
+// Prints the command lines that a call would run, one a line, without running any. The phone is the
+// file tree in HIDL_HOST_ROOT: its vendor/build.prop names the chip, and the suites find the module
+// files that it holds.
 
+#include <stdlib.h>
+
+#include <filesystem>
 #include <iostream>
+#include <map>
 
 #include "client/Commands.h"
 #include "recorder/RecordedShell.h"
@@ -17,6 +22,33 @@ using ::vendor::korvan::bex::wifi::client::readRequest;
 using ::vendor::korvan::bex::wifi::client::Request;
 using ::vendor::korvan::bex::wifi::V1_0::IWifiService;
 
+namespace {
+
+/** The names in each of the phone's folders of kernel modules, in the order of the folder. */
+using Modules = std::map<std::string, std::vector<std::string>>;
+
+Modules modulesOf(const std::string& root) {
+    Modules modules;
+    for (const char* folder : {"/system/lib/modules", "/vendor/lib/modules"}) {
+        std::error_code absent;
+        std::filesystem::recursive_directory_iterator files(root + folder, absent);
+        for (const auto& file : files) {
+            const std::string inside = file.path().parent_path().string().substr(root.size());
+            modules[inside].push_back(file.path().filename());
+        }
+    }
+    return modules;
+}
+
+void show(const Modules& modules, recorder::RecordedShell& shell) {
+    for (const auto& [folder, names] : modules) {
+        shell.directory(folder, names);
+        for (const std::string& name : names) shell.readable(folder + "/" + name);
+    }
+}
+
+} // namespace
+
 int main(int argc, char** argv) {
     Request request;
     std::string problem = "usage: explain METHOD [ARGUMENT]...";
@@ -25,7 +57,11 @@ int main(int argc, char** argv) {
         return 2;
     }
 
-    const recorder::RecordedShell shell;
+    const char* root = getenv("HIDL_HOST_ROOT");
+    const Modules modules = modulesOf(root == nullptr ? "" : root);
+    // From here on the process sees the files that it shows, and no others.
+    recorder::RecordedShell shell;
+    show(modules, shell);
     const sp<IWifiService> service = new implementation::WifiService();
     if (implementation::vendorTestSuit == nullptr) {
         std::cerr << "explain: the property ro.hardware.wlan.vendor names no known vendor\n";
