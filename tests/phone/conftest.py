@@ -6,6 +6,7 @@ import os
 import pathlib
 import re
 import subprocess
+import time
 
 import pytest
 
@@ -18,6 +19,14 @@ CLIENT = "/vendor/bin/bex-wifi-client"
 LOG_HEAD = r"\S+ [A-Z] \d\d-\d\d \d\d:\d\d:\d\d +\d+ +\d+ "
 COMMAND = re.compile(
     rf'^{LOG_HEAD}cmd: "(.*?)" (successful|unsuccessful) execution$', re.MULTILINE | re.DOTALL)
+
+
+def wait_for(condition):
+    """Waits until the condition holds; a minute means that it never will."""
+    deadline = time.monotonic() + 60
+    while not condition():
+        assert time.monotonic() < deadline
+        time.sleep(0.005)
 
 
 class Phone:

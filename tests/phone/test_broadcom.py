@@ -1,14 +1,15 @@
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
-"""All sixteen methods on the Broadcom phone, through the client, and what can go wrong there."""
+"""What the Broadcom phone does behind a call, and what can go wrong on any phone."""
 
 import json
 import os
 import signal
 import subprocess
-import time
 
 import pytest
+
+from conftest import wait_for
 
 COUNTER = ("wl counters  | busybox grep pktengrxdmcast | busybox awk '{for(i = 1;i <= NF;i++) "
            "{if(\"pktengrxdmcast\" == $i) print $(i + 1)} }' ")
@@ -19,55 +20,6 @@ def broadcom_phone(make_phone):
     phone = make_phone("broadcom")
     phone.up()
     return phone
-
-
-def wait_for(condition):
-    """Waits until the condition holds; a minute means that it never will."""
-    deadline = time.monotonic() + 60
-    while not condition():
-        assert time.monotonic() < deadline
-        time.sleep(0.005)
-
-
-# Method, arguments and the result, in an order in which each finds the phone in a state that it
-# can work in. None: a packet count.
-SESSION = [
-    (["isMimoSupport"], "true"),
-    (["getWlanMode"], "0"),
-    (["isSnifferMode"], "false"),
-    (["RunTxBGStart", "6", "54", "15", "1"], "0"),
-    (["RunTxStop", "6"], "0"),
-    (["RunTxNStart", "36", "80", "9", "12", "true", "3"], "0"),
-    (["RunTxStop", "36"], "0"),
-    (["RunTxAxStart", "36", "80", "9", "12", "0", "1"], "0"),
-    (["RunTxStStart", "11", "20", "1"], "0"),
-    (["RunTxStStop", "11"], "0"),
-    (["RunRxBgStart", "6", "54", "1"], None),
-    (["RunRxStop", "6"], None),
-    (["RunRxNStart", "149", "40", "7", "false", "2"], None),
-    (["RunRxStop", "149"], None),
-    (["RunRxAxStart", "36", "80", "9", "1"], "ok"),
-    (["RunRxApJoinHoc", "test-ap", "192.168.1.7"], "0"),
-    (["snifferStart", "36", "40"], "0"),
-    (["isSnifferMode"], "true"),
-    (["getWlanMode"], "4"),
-    (["snifferStop"], "0"),
-    (["getWlanMode"], "0"),
-]
-
-
-def test_every_method(phone):
-    """Each call gives its result and runs exactly the lines that explain prints for it."""
-    for call, result in SESSION:
-        seen = phone.log.stat().st_size
-        client = phone.client(*call)
-        assert client.returncode == 0, (call, client.stderr)
-        assert client.stderr == b"", call
-        text = client.stdout.decode().rstrip("\n")
-        assert text.isdigit() if result is None else text == result, call
-        assert phone.commands(seen) == [(line, True) for line in phone.explain(*call)], call
-    assert {call[0] for call, _ in SESSION} == {
-        method["name"] for method in json.loads(phone.client("list", "--json").stdout)["methods"]}
 
 
 def test_the_count_comes_from_the_chips_counters(phone):

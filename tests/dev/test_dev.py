@@ -1,0 +1,107 @@
+# Copyright 2026 The BEX Wi-Fi Authors
+# SPDX-License-Identifier: Apache-2.0
+"""The entry script, as a developer uses it. Its phones live in a folder of the test's own."""
+
+import os
+import pathlib
+import re
+import signal
+import subprocess
+
+import pytest
+
+ROOT = pathlib.Path(__file__).resolve().parents[2]
+
+
+@pytest.fixture(name="phones")
+def folder_of_phones(tmp_path):
+    return tmp_path / "phones"
+
+
+@pytest.fixture(name="dev")
+def dev_command(phones):
+    def run(*arguments):
+        return subprocess.run(
+            [ROOT / "dev", *arguments], capture_output=True, text=True, check=False, timeout=300,
+            stdin=subprocess.DEVNULL, env={**os.environ, "BEX_PHONES": str(phones)}, cwd="/")
+
+    return run
+
+
+def processes_of(phones):
+    """The processes that have the folder in their command line."""
+    found = []
+    for entry in pathlib.Path("/proc").glob("[0-9]*/cmdline"):
+        try:
+            if str(phones).encode() in entry.read_bytes():
+                found.append(entry)
+        except OSError:
+            pass  # it has ended
+    return found
+
+
+def test_explain_prints_just_the_lines(dev, phones):
+    explained = dev("explain", "broadcom", "RunTxStop", "6")
+    assert explained.returncode == 0
+    assert explained.stderr == ""
+    assert explained.stdout == (
+        "wl pkteng_stop tx \n"
+        "ifconfig wlan0 down \n"
+        'echo -n "/etc/firmware/fw_bcmdhd.bin" > /sys/module/bcmdhd/parameters/firmware_path \n')
+    assert list(phones.iterdir()) == []
+
+
+def test_demo(dev, phones):
+    """A reception's count is read by the real pipeline, and nothing is left behind."""
+    demo = dev("demo", "broadcom")
+    assert demo.returncode == 0, demo.stderr
+    assert '  "wl 2g_rate -r 54 -b 20 " -> ok\n' in demo.stdout
+    stop = demo.stdout[demo.stdout.index("$ bex-wifi-client RunRxStop 6"):]
+    count = re.search(r"printed: (\d+)\n", stop)[1]
+    assert int(count) > 0
+    assert f"  result: {count}\n" in stop
+    assert list(phones.iterdir()) == []
+    assert processes_of(phones) == []
+
+
+def test_a_phone_until_ctrl_c(dev, phones):
+    # An interactive shell's job: in a group of its own, and Ctrl-C is not ignored.
+    with subprocess.Popen(
+            [ROOT / "dev", "phone", "wcn6750"], stdout=subprocess.PIPE, text=True,
+            env={**os.environ, "BEX_PHONES": str(phones)}, start_new_session=True) as phone:
+        assert phone.stdout.readline().startswith("The wcn6750 phone is up")
+        second = dev("phone", "broadcom")
+        assert (second.returncode, second.stdout) == (1, "")
+        assert second.stderr == "dev: a phone is up already: end that one first\n"
+        assert dev("client", "isSnifferMode").stdout == "false\n"
+        wrong = dev("client", "RunTxStop")
+        assert (wrong.returncode, wrong.stdout) == (2, "")
+        os.killpg(phone.pid, signal.SIGINT)
+        assert phone.wait(60) == 0
+    assert list(phones.iterdir()) == []
+    assert processes_of(phones) == []
+    gone = dev("client", "isSnifferMode")
+    assert (gone.returncode, gone.stderr) == (
+        3, "dev: no phone is up: start one with ./dev phone CHIP\n")
+
+
+@pytest.mark.parametrize("arguments, message", [
+    (["phone"], "dev: which chip? One of: broadcom"),
+    (["demo", "acme"], "dev: no phone for the chip 'acme': there is broadcom"),
+    (["explain", "broadcom", "RunTxStop"], "explain: RunTxStop takes 1 argument"),
+    (["explain", "broadcom", "runtxstop", "6"], "explain: unknown method"),
+    (["start"], "dev: there is no command 'start': see ./dev help"),
+])
+def test_wrong_usage_is_one_line(dev, arguments, message):
+    wrong = dev(*arguments)
+    assert wrong.returncode == 2
+    assert wrong.stdout == ""
+    assert wrong.stderr.startswith(message)
+    assert len(wrong.stderr.splitlines()) == 1
+
+
+def test_help_names_the_chips(dev):
+    usage = dev("help")
+    assert usage.returncode == 0
+    for chip in (ROOT / "simulator/phones").iterdir():
+        assert chip.name in usage.stdout.splitlines()[-1]

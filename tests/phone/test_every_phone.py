@@ -1,0 +1,77 @@
+# Copyright 2026 The BEX Wi-Fi Authors
+# SPDX-License-Identifier: Apache-2.0
+"""All sixteen methods on every simulated phone, through the client."""
+
+import json
+import re
+
+import pytest
+
+from conftest import ROOT
+
+CHIPS = sorted(path.name for path in (ROOT / "simulator/phones").iterdir())
+
+# The forms of what a reception answers; what is not told is told of the driver-tool families.
+COUNT = r"\d+"
+STARTED = {"broadcom": COUNT, "wcn": COUNT}
+STOPPED = {"broadcom": COUNT, "wcn": COUNT}
+AX_STARTED = {"wcn": " "}
+# Their 802.11ax start receives nothing, so there is nothing to count.
+AX_STOPPED = {"qca": "Rx: ", "wcn39xx": "Rx: "}
+
+# Of the modules that these phones have, only some fit the chip.
+ILL_FITTING = {"wcn685x"}
+
+
+def session(chip, mimo):
+    """Each call with the form of its answer, in an order in which each finds the phone in a state
+    that it can work in."""
+    started = STARTED.get(chip, "ok")
+    stopped = STOPPED.get(chip, rf"Rx: {COUNT}")
+    return [
+        (["isMimoSupport"], mimo),
+        (["getWlanMode"], "0"),
+        (["isSnifferMode"], "false"),
+        (["RunTxBGStart", "6", "54", "15", "1"], "0"),
+        (["RunTxStop", "6"], "0"),
+        (["RunTxNStart", "36", "80", "9", "12", "true", "3"], "0"),
+        (["RunTxStop", "36"], "0"),
+        (["RunTxAxStart", "36", "80", "9", "12", "0", "1"], "0"),
+        (["RunTxStop", "36"], "0"),
+        (["RunTxStStart", "11", "20", "1"], "0"),
+        (["RunTxStStop", "11"], "0"),
+        (["RunRxBgStart", "6", "54", "1"], started),
+        (["RunRxStop", "6"], stopped),
+        (["RunRxNStart", "149", "40", "7", "false", "2"], started),
+        (["RunRxStop", "149"], stopped),
+        (["RunRxAxStart", "36", "80", "9", "1"], AX_STARTED.get(chip, "ok")),
+        (["RunRxStop", "36"], AX_STOPPED.get(chip, stopped)),
+        (["RunRxApJoinHoc", "test-ap", "192.168.1.7"], "0"),
+        (["snifferStart", "36", "40"], "0"),
+        (["isSnifferMode"], "true"),
+        (["getWlanMode"], "4"),
+        (["snifferStop"], "0"),
+        (["getWlanMode"], "0"),
+    ]
+
+
+@pytest.mark.parametrize("chip", CHIPS)
+def test_every_method(make_phone, chip):
+    """Each call gives its result and runs exactly the lines that explain prints for it."""
+    phone = make_phone(chip)
+    phone.up()
+    mimo = "wlan.mimo=1" in (phone.root / "vendor/build.prop").read_text()
+    calls = session(chip, "true" if mimo else "false")
+    for call, form in calls:
+        seen = phone.log.stat().st_size
+        client = phone.client(*call)
+        text = client.stdout.decode()
+        assert re.fullmatch(f"{form}\n", text), (call, text, phone.commands(seen))
+        assert (client.returncode, client.stderr) == (0, b""), call
+        commands = phone.commands(seen)
+        assert [line for line, _ in commands] == phone.explain(*call), call
+        failed = [line for line, ok in commands if not ok]
+        assert chip in ILL_FITTING or not failed, call
+        assert all("insmod " in line for line in failed), call
+    methods = json.loads(phone.client("list", "--json").stdout)["methods"]
+    assert {call[0] for call, _ in calls} == {method["name"] for method in methods}
