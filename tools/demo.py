@@ -32,7 +32,8 @@ SESSION = [
 # A log line as liblog prints it on a host: tag, priority, date, time, process, thread, text. A text of
 # several lines goes on without that head.
 LOG_HEAD = re.compile(r"^(\S+) ([A-Z]) \d\d-\d\d \d\d:\d\d:\d\d +\d+ +\d+ (.*)$")
-COMMAND = re.compile(r'^cmd: "(.*)" (successful|unsuccessful) execution$', re.DOTALL)
+# What follows such a line without a head is what the next command says on stderr.
+COMMAND = re.compile(r'^cmd: "(.*?)" (successful|unsuccessful) execution(?:\n(.*))?$', re.DOTALL)
 # The tags of the two that run commands.
 RUNNERS = {"wifi@1.0-VendorTestSuit", "wifi@1.0-SnifferTool"}
 
@@ -53,9 +54,9 @@ def show_commands(log):
     """Prints the commands of a piece of log, each with its outcome and what it printed."""
     output = ""
     for tag, text in messages(log):
-        command = COMMAND.match(text.rstrip("\n"))
         if tag not in RUNNERS:
             continue
+        command = COMMAND.match(text.rstrip("\n"))
         if command is None:
             output += text.rstrip("\n") + "\n"
             continue
@@ -64,7 +65,7 @@ def show_commands(log):
         for line in output.splitlines():
             if line:
                 print(f"      printed: {line}")
-        output = ""
+        output = command[3] or ""
 
 
 def main():
