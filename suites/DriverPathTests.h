@@ -34,13 +34,13 @@ inline constexpr DriverPathChip kWcn6750Chip = {"-B phya",  "0",     "0",    "-x
  * a start reloads them in factory test mode and runs one myftm command, a stop reloads them
  * normally.
  *
- * Runs everything through the suite that owns it, which has operations of the same names, and logs
+ * Runs everything through the suite that makes it, which has operations of the same names, and logs
  * every line under that name. A module that does not load fails no operation but RunRxStop.
  */
 class DriverPathTests {
   public:
     /**
-     * @param suit The suite that owns this object.
+     * @param suit The suite that these are the tests of. Outlives this object.
      * @param tag The suite's log tag.
      * @param chip Lives for the whole process.
      * @param driverPaths The driver's module files, in the order in which they load. Outlives this

@@ -53,13 +53,13 @@ extern const FirmwarePathChip kWcn39xxChip;
  * The radio tests of chips whose driver is one module file, through the myftm tool: a start reloads
  * the driver in factory test mode and runs one myftm command, a stop reloads it normally.
  *
- * Runs everything through the suite that owns it, which has operations of the same names. myftm has
- * two commands that end what runs: -t 0 is for transmissions, -x 0 for receptions.
+ * Runs everything through the suite that makes it, which has operations of the same names. myftm
+ * has two commands that end what runs: -t 0 is for transmissions, -x 0 for receptions.
  */
 class FirmwarePathTests {
   public:
     /**
-     * @param suit The suite that owns this object.
+     * @param suit The suite that these are the tests of. Outlives this object.
      * @param tag The suite's log tag.
      * @param chip Lives for the whole process.
      * @param fwPath The driver's module file; empty while there is none, which ends the command

@@ -15,7 +15,7 @@ namespace {
 constexpr const char* kLogTag = "wifi@1.0-Qca639xTestSuit.qca639x";
 } // namespace
 
-Qca639xTestSuit::Qca639xTestSuit() : mTests(*this, kLogTag, kQca639xChip, driverPaths) {
+Qca639xTestSuit::Qca639xTestSuit() {
     if (getDriverPaths() != 0) {
         __android_log_print(ANDROID_LOG_ERROR, kLogTag, "cannot find wlan driver : %s",
                             "Qca639xTestSuit");
@@ -44,7 +44,11 @@ std::string Qca639xTestSuit::getAxbandwidthPara(const std::string& bandwidth) {
 }
 
 std::string Qca639xTestSuit::Qca639xParseReceivedPacketNum(const std::string& output) {
-    return mTests.parseReceivedPacketNum(output);
+    return tests().parseReceivedPacketNum(output);
+}
+
+DriverPathTests Qca639xTestSuit::tests() {
+    return {*this, kLogTag, kQca639xChip, driverPaths};
 }
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

@@ -19,7 +19,7 @@ std::string FwPath;
 
 } // namespace
 
-QcaTestSuit::QcaTestSuit() : mTests(*this, kLogTag, kQcaChip, FwPath) {
+QcaTestSuit::QcaTestSuit() {
     if (FwPath.empty() && getFwPath() != 0) {
         __android_log_print(ANDROID_LOG_ERROR, kLogTag, "cannot find wlan driver : %s",
                             "QcaTestSuit");
@@ -44,7 +44,11 @@ std::string QcaTestSuit::getAbgProtocalIndex(const std::string& rate) {
 }
 
 std::string QcaTestSuit::ParseReceivedPacketNum(const std::string& output) {
-    return mTests.parseReceivedPacketNum(output);
+    return tests().parseReceivedPacketNum(output);
+}
+
+FirmwarePathTests QcaTestSuit::tests() {
+    return {*this, kLogTag, kQcaChip, FwPath};
 }
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

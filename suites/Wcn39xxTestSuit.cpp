@@ -19,7 +19,7 @@ std::string FwPath;
 
 } // namespace
 
-Wcn39xxTestSuit::Wcn39xxTestSuit() : mTests(*this, kLogTag, kWcn39xxChip, FwPath) {
+Wcn39xxTestSuit::Wcn39xxTestSuit() {
     if (FwPath.empty() && getFwPath() != 0) {
         __android_log_print(ANDROID_LOG_ERROR, kLogTag, "cannot find wlan driver : %s",
                             "Wcn39xxTestSuit");
@@ -44,7 +44,11 @@ std::string Wcn39xxTestSuit::getAbgProtocalIndex(const std::string& rate) {
 }
 
 std::string Wcn39xxTestSuit::ParseReceivedPacketNum(const std::string& output) {
-    return mTests.parseReceivedPacketNum(output);
+    return tests().parseReceivedPacketNum(output);
+}
+
+FirmwarePathTests Wcn39xxTestSuit::tests() {
+    return {*this, kLogTag, kWcn39xxChip, FwPath};
 }
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

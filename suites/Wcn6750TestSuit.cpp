@@ -15,7 +15,7 @@ namespace {
 constexpr const char* kLogTag = "wifi@1.0-Wcn6750TestSuit.wcn6750";
 } // namespace
 
-Wcn6750TestSuit::Wcn6750TestSuit() : mTests(*this, kLogTag, kWcn6750Chip, driverPaths) {
+Wcn6750TestSuit::Wcn6750TestSuit() {
     if (getDriverPaths() != 0) {
         __android_log_print(ANDROID_LOG_ERROR, kLogTag, "cannot find wlan driver : %s",
                             "Wcn6750TestSuit");
@@ -44,7 +44,11 @@ std::string Wcn6750TestSuit::getAxbandwidthPara(const std::string& bandwidth) {
 }
 
 std::string Wcn6750TestSuit::Wcn6750ParseReceivedPacketNum(const std::string& output) {
-    return mTests.parseReceivedPacketNum(output);
+    return tests().parseReceivedPacketNum(output);
+}
+
+DriverPathTests Wcn6750TestSuit::tests() {
+    return {*this, kLogTag, kWcn6750Chip, driverPaths};
 }
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

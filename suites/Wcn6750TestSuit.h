@@ -19,50 +19,50 @@ class Wcn6750TestSuit : public VendorTestSuit {
 
     int RunTxBGStart(const std::string& channel, const std::string& rate, const std::string& power,
                      const std::string& antenna) override {
-        return mTests.RunTxBGStart(channel, rate, power, antenna);
+        return tests().RunTxBGStart(channel, rate, power, antenna);
     }
     int RunTxNStart(const std::string& channel, const std::string& bandwidth,
                     const std::string& mcs, const std::string& power, bool vht,
                     const std::string& antenna) override {
-        return mTests.RunTxNStart(channel, bandwidth, mcs, power, vht, antenna);
+        return tests().RunTxNStart(channel, bandwidth, mcs, power, vht, antenna);
     }
     int RunTxAxStart(const std::string& channel, const std::string& bandwidth,
                      const std::string& mcs, const std::string& power,
                      const std::string& guardInterval, const std::string& antenna) override {
-        return mTests.RunTxAxStart(channel, bandwidth, mcs, power, guardInterval, antenna);
+        return tests().RunTxAxStart(channel, bandwidth, mcs, power, guardInterval, antenna);
     }
 
     /** Does not use `bandwidth`. */
     int RunTxStStart(const std::string& channel, const std::string& /*bandwidth*/,
                      const std::string& antenna) override {
-        return mTests.RunTxStStart(channel, antenna);
+        return tests().RunTxStStart(channel, antenna);
     }
 
     /** Is RunTxStop, also where a subclass has its own. */
     int RunTxStStop(const std::string& channel) override { return RunTxStop(channel); }
-    int RunTxStop(const std::string& channel) override { return mTests.RunTxStop(channel); }
+    int RunTxStop(const std::string& channel) override { return tests().RunTxStop(channel); }
     int RunRxApJoinHoc(const std::string& ssid, const std::string& address) override {
-        return mTests.RunRxApJoinHoc(ssid, address);
+        return tests().RunRxApJoinHoc(ssid, address);
     }
 
     // The starts of a reception leave "ok" or "failure" in `out`.
     int RunRxBgStart(const std::string& channel, const std::string& rate,
                      const std::string& antenna, std::string& out) override {
-        return mTests.RunRxBgStart(channel, rate, antenna, out);
+        return tests().RunRxBgStart(channel, rate, antenna, out);
     }
     int RunRxNStart(std::string channel, const std::string& bandwidth, const std::string& mcs,
                     bool vht, const std::string& antenna, std::string& out) override {
-        return mTests.RunRxNStart(channel, bandwidth, mcs, vht, antenna, out);
+        return tests().RunRxNStart(channel, bandwidth, mcs, vht, antenna, out);
     }
     int RunRxAxStart(const std::string& channel, const std::string& bandwidth,
                      const std::string& mcs, const std::string& antenna,
                      std::string& out) override {
-        return mTests.RunRxAxStart(channel, bandwidth, mcs, antenna, out);
+        return tests().RunRxAxStart(channel, bandwidth, mcs, antenna, out);
     }
 
     /** Leaves "Rx: " and the packet count in `out`. */
     int RunRxStop(const std::string& channel, std::string& out) override {
-        return mTests.RunRxStop(channel, out);
+        return tests().RunRxStop(channel, out);
     }
 
     /** Adds the driver's module files to driverPaths; see listDriverPaths. Returns 0 or -1. */
@@ -84,7 +84,8 @@ class Wcn6750TestSuit : public VendorTestSuit {
     std::vector<std::string> driverPaths;
 
   private:
-    DriverPathTests mTests;
+    /** The tables that this chip's tests are made from. */
+    DriverPathTests tests();
 };
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation
