@@ -34,5 +34,5 @@ function(process_test name)
     add_test(NAME ${name} COMMAND /usr/bin/python3 -B -m pytest -q -p no:cacheprovider
                                   ${TEST_UNPARSED_ARGUMENTS}
     )
-    set_tests_properties(${name} PROPERTIES ENVIRONMENT "${TEST_ENVIRONMENT}" TIMEOUT 300)
+    set_tests_properties(${name} PROPERTIES ENVIRONMENT "${TEST_ENVIRONMENT}" TIMEOUT 900)
 endfunction()
