@@ -69,7 +69,7 @@ Outcome callService(const Request& request, const FindService& find,
         }
     }
     const bool done = shared->done;
-    const Outcome outcome{shared->ending, shared->answer, Clock::now() - start};
+    Outcome outcome{shared->ending, shared->answer, Clock::now() - start};
     guard.unlock();
     if (done) {
         worker.join();

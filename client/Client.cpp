@@ -118,7 +118,7 @@ Outcome callWatched(const Request& request, const CommandLine& line, const Surro
             to.err << '\r' << shown << std::flush;
         };
     }
-    const Outcome outcome =
+    Outcome outcome =
             callService(request, line.timeout ? to.awaitFind : to.tryFind, line.timeout, progress);
     if (!shown.empty()) to.err << '\r' << std::string(shown.size(), ' ') << '\r' << std::flush;
     return outcome;

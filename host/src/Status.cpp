@@ -6,6 +6,7 @@
 
 #include <cstring>
 #include <sstream>
+#include <utility>
 
 namespace android::hardware {
 namespace {
@@ -109,7 +110,7 @@ std::ostream& operator<<(std::ostream& out, const Status& status) {
 namespace details {
 
 return_status::return_status(return_status&& other) noexcept
-      : mStatus(other.mStatus), mChecked(other.mChecked) {
+      : mStatus(std::move(other.mStatus)), mChecked(other.mChecked) {
     other.mChecked = true;
 }
 

@@ -122,7 +122,7 @@ TEST_F(CommandsTest, AMethodThatNeverAnswersHasNotDelivered) {
 TEST_F(CommandsTest, ArgumentsAndTextsPassByteForByte) {
     std::string everyByte;
     for (int byte = 0; byte < 256; ++byte) everyByte += static_cast<char>(byte);
-    const std::string large(300 * 1024, '\xFE');
+    const std::string large(300'000, '\xFE');
     mService->text = everyByte + large;
 
     const Answer answer = callWith({"RunRxBgStart", everyByte, "", large}, *mService);

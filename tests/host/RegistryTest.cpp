@@ -223,7 +223,7 @@ TEST_F(RegistryTest, NoFolderForSockets) {
 TEST_F(RegistryTest, NeverGoneWhileReplaced) {
     std::vector<std::string> steps = {"pool", "2", "register", "default", "ready"};
     for (int i = 0; i < 300; ++i) steps.insert(steps.end(), {"register", "default"});
-    steps.push_back("join");
+    steps.emplace_back("join");
     ServerProcess server(steps);
     ASSERT_EQ(server.report(), "0");
     ASSERT_EQ(server.report(), "ready");
