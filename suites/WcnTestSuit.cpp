@@ -116,12 +116,7 @@ int WcnTestSuit::RunTxNStart(const std::string& channel, const std::string& band
 
 int WcnTestSuit::RunTxAxStart(const std::string&, const std::string&, const std::string&,
                               const std::string&, const std::string&, const std::string&) {
-    return runTable({
-        kEndTest,
-        kUnload,
-        loadForTest(),
-        kBeginTest,
-    });
+    return enterTestMode();
 }
 
 int WcnTestSuit::RunTxStStart(const std::string& channel, const std::string& bandwidth,
@@ -195,12 +190,7 @@ int WcnTestSuit::RunRxNStart(std::string channel, const std::string&, const std:
 
 int WcnTestSuit::RunRxAxStart(const std::string&, const std::string&, const std::string&,
                               const std::string&, std::string& out) {
-    const int status = runTable({
-        kEndTest,
-        kUnload,
-        loadForTest(),
-        kBeginTest,
-    });
+    const int status = enterTestMode();
     out = " ";
     return status;
 }
@@ -215,6 +205,15 @@ int WcnTestSuit::RunRxStop(const std::string&, std::string& out) {
         loadNormally(),
     });
     return counted == 0 && ended == 0 ? 0 : -1;
+}
+
+int WcnTestSuit::enterTestMode() {
+    return runTable({
+        kEndTest,
+        kUnload,
+        loadForTest(),
+        kBeginTest,
+    });
 }
 
 // clang-format on

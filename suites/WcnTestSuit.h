@@ -59,6 +59,9 @@ class WcnTestSuit : public VendorTestSuit {
     int getFwPath();
 
   private:
+    /** Reloads the driver in factory test mode, and nothing more. */
+    int enterTestMode();
+
     /** The packet count in the output of the counter command; empty when it failed. */
     std::string packetCount(const std::string& output);
 };
