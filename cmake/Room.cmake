@@ -24,15 +24,23 @@ endfunction()
 function(unit_test name)
     program(${name} ${ARGN})
     target_link_libraries(${name} PRIVATE GTest::gmock_main)
-    gtest_discover_tests(${name} TEST_PREFIX ${name}. DISCOVERY_MODE PRE_TEST)
+    gtest_discover_tests(
+        ${name} TEST_PREFIX ${name}. DISCOVERY_MODE PRE_TEST PROPERTIES TIMEOUT 60
+    )
 endfunction()
 
-# process_test(<name> <file>... [ENVIRONMENT <NAME=value>...]): pytest files that drive whole programs.
+# process_test(<name> <file>... [TIMEOUT <seconds>] [ENVIRONMENT <NAME=value>...]): pytest files that
+# drive whole programs.
 function(process_test name)
-    cmake_parse_arguments(TEST "" "" "ENVIRONMENT" ${ARGN})
+    cmake_parse_arguments(TEST "" "TIMEOUT" "ENVIRONMENT" ${ARGN})
+    if(NOT TEST_TIMEOUT)
+        set(TEST_TIMEOUT 900)
+    endif()
     list(TRANSFORM TEST_UNPARSED_ARGUMENTS PREPEND ${CMAKE_CURRENT_SOURCE_DIR}/)
     add_test(NAME ${name} COMMAND /usr/bin/python3 -B -m pytest -q -p no:cacheprovider
                                   ${TEST_UNPARSED_ARGUMENTS}
     )
-    set_tests_properties(${name} PROPERTIES ENVIRONMENT "${TEST_ENVIRONMENT}" TIMEOUT 900)
+    set_tests_properties(
+        ${name} PROPERTIES ENVIRONMENT "${TEST_ENVIRONMENT}" TIMEOUT ${TEST_TIMEOUT}
+    )
 endfunction()
