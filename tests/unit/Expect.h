@@ -64,7 +64,7 @@ inline std::string rangeMessage(size_t index, size_t size) {
 /** Runs `code` in a process of its own, where no suite has found a driver yet. */
 template <typename Code>
 void inFreshProcess(Code code) {
-    GTEST_FLAG_SET(death_test_style, "threadsafe");
+    ::testing::GTEST_FLAG(death_test_style) = "threadsafe";
     EXPECT_EXIT(
             {
                 code();
