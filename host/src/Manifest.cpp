@@ -11,6 +11,7 @@
 
 #include <cstdlib>
 #include <regex>
+#include <set>
 #include <vector>
 
 #include "host/src/HostRoot.h"
@@ -20,13 +21,14 @@ namespace {
 
 using tinyxml2::XMLElement;
 
+using Instances = std::set<std::string>;
+
 /** A fully qualified name in its parts. */
 struct Wanted {
     std::string package;
     int major;
     int minor;
     std::string interface;
-    std::string instance;
 };
 
 bool covers(const std::string& version, const Wanted& wanted) {
@@ -51,69 +53,69 @@ std::vector<const XMLElement*> children(const XMLElement* element, const char* n
     return found;
 }
 
-/** "@1.0::IWifiService/default" */
-bool namesInstance(const std::string& fqname, const Wanted& wanted) {
+/** Adds the instance of "@1.0::IWifiService/default". */
+void addFqname(const std::string& fqname, const Wanted& wanted, Instances* found) {
     const size_t colons = fqname.find("::");
-    if (colons == std::string::npos || fqname[0] != '@') return false;
-    return covers(fqname.substr(1, colons - 1), wanted) &&
-           fqname.substr(colons + 2) == wanted.interface + "/" + wanted.instance;
+    const size_t slash = fqname.find('/');
+    if (colons == std::string::npos || slash == std::string::npos || fqname[0] != '@') return;
+    // No version holds a slash, so the slash is behind the colons from here on.
+    if (!covers(fqname.substr(1, colons - 1), wanted)) return;
+    if (fqname.substr(colons + 2, slash - colons - 2) != wanted.interface) return;
+    found->insert(fqname.substr(slash + 1));
 }
 
-bool declares(const XMLElement* hal, const Wanted& wanted) {
+void addHal(const XMLElement* hal, const Wanted& wanted, Instances* found) {
     const char* format = hal->Attribute("format");
-    if (format != nullptr && std::string(format) != "hidl") return false;
-    if (textOf(hal->FirstChildElement("name")) != wanted.package) return false;
-    for (auto* fqname : children(hal, "fqname")) {
-        if (namesInstance(textOf(fqname), wanted)) return true;
-    }
+    if (format != nullptr && std::string(format) != "hidl") return;
+    if (textOf(hal->FirstChildElement("name")) != wanted.package) return;
+    for (auto* fqname : children(hal, "fqname")) addFqname(textOf(fqname), wanted, found);
     bool versionFits = false;
     for (auto* version : children(hal, "version")) {
         versionFits = versionFits || covers(textOf(version), wanted);
     }
-    if (!versionFits) return false;
+    if (!versionFits) return;
     for (auto* interface : children(hal, "interface")) {
         if (textOf(interface->FirstChildElement("name")) != wanted.interface) continue;
-        for (auto* instance : children(interface, "instance")) {
-            if (textOf(instance) == wanted.instance) return true;
-        }
+        for (auto* instance : children(interface, "instance")) found->insert(textOf(instance));
     }
-    return false;
 }
 
-bool fileDeclares(const char* path, const Wanted& wanted) {
+void addFile(const char* path, const Wanted& wanted, Instances* found) {
     tinyxml2::XMLDocument document;
     const tinyxml2::XMLError error = document.LoadFile(path);
-    if (error == tinyxml2::XML_ERROR_FILE_NOT_FOUND) return false;
+    if (error == tinyxml2::XML_ERROR_FILE_NOT_FOUND) return;
     const XMLElement* manifest = document.FirstChildElement("manifest");
     if (error != tinyxml2::XML_SUCCESS || manifest == nullptr) {
         ALOGE("%s is not a manifest and is ignored", path);
-        return false;
+        return;
     }
-    for (auto* hal : children(manifest, "hal")) {
-        if (declares(hal, wanted)) return true;
-    }
-    return false;
+    for (auto* hal : children(manifest, "hal")) addHal(hal, wanted, found);
 }
 
 } // namespace
 
-bool isDeclaredInManifest(const std::string& descriptor, const std::string& instance) {
+std::set<std::string> instancesInManifest(const std::string& descriptor) {
     static const std::regex kDescriptor(R"(([^@]+)@(\d{1,5})\.(\d{1,5})::(\w+))");
     std::smatch part;
-    if (!std::regex_match(descriptor, part, kDescriptor)) return false;
-    const Wanted wanted = {part[1], std::stoi(part[2]), std::stoi(part[3]), part[4], instance};
+    if (!std::regex_match(descriptor, part, kDescriptor)) return {};
+    const Wanted wanted = {part[1], std::stoi(part[2]), std::stoi(part[3]), part[4]};
 
+    Instances found;
     const std::string folder = hostRoot() + "/vendor/etc/vintf/";
-    if (fileDeclares((folder + "manifest.xml").c_str(), wanted)) return true;
+    addFile((folder + "manifest.xml").c_str(), wanted, &found);
     glob_t fragments = {};
-    bool found = false;
     if (glob((folder + "manifest/*.xml").c_str(), 0, nullptr, &fragments) == 0) {
-        for (size_t i = 0; i < fragments.gl_pathc && !found; ++i) {
-            found = fileDeclares(fragments.gl_pathv[i], wanted);
+        for (size_t i = 0; i < fragments.gl_pathc; ++i) {
+            addFile(fragments.gl_pathv[i], wanted, &found);
         }
     }
     globfree(&fragments);
+    found.erase(""); // an instance without a name is none
     return found;
+}
+
+bool isDeclaredInManifest(const std::string& descriptor, const std::string& instance) {
+    return instancesInManifest(descriptor).count(instance) != 0;
 }
 
 } // namespace android::hardware::host

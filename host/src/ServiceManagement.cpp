@@ -31,6 +31,11 @@ sp<hidl::manager::V1_0::IServiceManager> defaultServiceManager() {
     return nullptr;
 }
 
+std::vector<std::string> getAllHalInstanceNames(const std::string& descriptor) {
+    const std::set<std::string> names = host::instancesInManifest(descriptor);
+    return {names.begin(), names.end()};
+}
+
 namespace details {
 namespace {
 

@@ -3,7 +3,8 @@
 
 // Which instances the VINTF manifest declares.
 
-#include <sys/stat.h>
+#include <hidl/GtestPrinter.h>
+#include <hidl/ServiceManagement.h>
 
 #include "host/src/Manifest.h"
 #include "tests/host/HostTest.h"
@@ -11,6 +12,8 @@
 namespace vendor::korvan::bex::wifi::tests {
 namespace {
 
+using ::android::hardware::getAllHalInstanceNames;
+using ::android::hardware::PrintInstanceNameToString;
 using ::android::hardware::host::isDeclaredInManifest;
 
 std::string manifest(const std::string& body, const std::string& attributes = "format=\"hidl\"") {
@@ -78,6 +81,27 @@ TEST_F(ManifestTest, BrokenFilesAreIgnored) {
                                "<manifest><hal><name/><version/></hal></manifest>"}) {
         EXPECT_TRUE(declares(broken)) << broken;
     }
+}
+
+TEST_F(ManifestTest, AllInstancesSortedAndOnce) {
+    using Names = std::vector<std::string>;
+    EXPECT_EQ(getAllHalInstanceNames(IWifiService::descriptor), Names());
+    write("vendor/etc/vintf/manifest.xml", manifest("<version>1.0</version>" + kInterface));
+    write("vendor/etc/vintf/manifest/a.xml", manifest("<fqname>@1.0::IWifiService/another</fqname>"
+                                                      "<fqname>@1.0::IWifiService/default</fqname>"
+                                                      "<fqname>@1.0::IWifiService/</fqname>"
+                                                      "<fqname>@1.0::IWifiService</fqname>"
+                                                      "<fqname>@1.0::IOther/other</fqname>"
+                                                      "<fqname>@2.0::IWifiService/newer</fqname>"));
+    EXPECT_EQ(getAllHalInstanceNames(IWifiService::descriptor),
+              Names({"another", "default", "second"}));
+    EXPECT_EQ(getAllHalInstanceNames("vendor.korvan.bex.wifi@1.0::IOther"), Names({"other"}));
+    EXPECT_EQ(getAllHalInstanceNames("IWifiService"), Names());
+}
+
+TEST_F(ManifestTest, TestsAreNamedByInstance) {
+    EXPECT_EQ(PrintInstanceNameToString({"default", 0}), "0_default");
+    EXPECT_EQ(PrintInstanceNameToString({"slot-1/a.b", 12}), "12_slot_1_a_b");
 }
 
 } // namespace

@@ -9,11 +9,21 @@
 #include <hidl/Status.h>
 
 #include <string>
+#include <vector>
 
 namespace android::hardware {
 
 /** There is no service manager on a host, the file system takes its place: always null. */
 sp<hidl::manager::V1_0::IServiceManager> defaultServiceManager();
+
+/**
+ * The instances of an interface that the VINTF manifest declares, running or not, sorted.
+ *
+ *     for (const std::string& name : getAllHalInstanceNames(IWifiService::descriptor)) {
+ *         sp<IWifiService> wifi = IWifiService::getService(name);
+ *     }
+ */
+std::vector<std::string> getAllHalInstanceNames(const std::string& descriptor);
 
 namespace details {
 
