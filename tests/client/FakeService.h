@@ -26,7 +26,7 @@ class FakeService : public V1_0::IWifiService {
     bool broken = false;
     /** A method with a text leaves its callback alone. */
     bool silent = false;
-    /** Runs in each call, on its thread. */
+    /** Runs in each call, on its thread; the answer may be set here. */
     std::function<void()> onCall = [] {};
     std::function<void()> onDestroyed = [] {};
     /** Each call's name and arguments. */
@@ -109,7 +109,7 @@ class FakeService : public V1_0::IWifiService {
     }
 
     template <typename T>
-    Return<T> answer(Words call, T value) {
+    Return<T> answer(Words call, const T& value) {
         calls.push_back(std::move(call));
         onCall();
         if (broken) return deadObject();
