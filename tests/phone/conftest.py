@@ -15,6 +15,7 @@ ROOT = pathlib.Path(__file__).resolve().parents[2]
 PHONE = ROOT / "simulator/phone"
 SERVICE = "vendor.korvan.bex.wifi@1.0-service"
 CLIENT = "/vendor/bin/bex-wifi-client"
+CHIPS = sorted(path.name for path in (ROOT / "simulator/phones").iterdir())
 
 # How liblog prints on a host: tag, priority, date, time, process, thread, text.
 LOG_HEAD = r"\S+ [A-Z] \d\d-\d\d \d\d:\d\d:\d\d +\d+ +\d+ "
@@ -33,14 +34,14 @@ def wait_for(condition):
 class Phone:
     """One phone; `folder` is where it lives on this machine."""
 
-    def __init__(self, chip, folder):
+    def __init__(self, chip, folder, *options):
         self.folder = folder
         self.root = folder / "root"
         self.log = folder / "log"
         self.phone("create", chip, folder,
                    "--install", f"{os.environ['BEX_SERVICE']}=/vendor/bin/hw/{SERVICE}",
                    "--install", f"{ROOT}/service/{SERVICE}.xml=/vendor/etc/vintf/manifest/{SERVICE}.xml",
-                   "--install", f"{os.environ['BEX_CLIENT']}={CLIENT}")
+                   "--install", f"{os.environ['BEX_CLIENT']}={CLIENT}", *options)
 
     @staticmethod
     def phone(*arguments):
@@ -59,8 +60,9 @@ class Phone:
         """The machine's command line for a command inside the phone."""
         return [PHONE, "run", self.folder, *arguments]
 
-    def run(self, *arguments):
-        return subprocess.run(self.command(*arguments), capture_output=True, check=False, timeout=60)
+    def run(self, *arguments, timeout=60):
+        return subprocess.run(self.command(*arguments), capture_output=True, check=False,
+                              timeout=timeout)
 
     def client(self, *arguments):
         return self.run(CLIENT, *arguments)
@@ -80,13 +82,14 @@ class Phone:
 
 @pytest.fixture(name="make_phone")
 def make_phone_fixture():
-    """Makes a phone that is not up yet; it is switched off when the test ends."""
+    """Makes a phone that is not up yet, with options of `phone create` at will; it is switched off
+    when the test ends."""
     made = []
     # A short path: in a deep folder the phone would borrow another place for its sockets.
     with tempfile.TemporaryDirectory(prefix="bex-") as folder:
 
-        def make(chip):
-            made.append(Phone(chip, pathlib.Path(folder, str(len(made)))))
+        def make(chip, *options):
+            made.append(Phone(chip, pathlib.Path(folder, str(len(made))), *options))
             return made[-1]
 
         yield make

@@ -7,9 +7,7 @@ import re
 
 import pytest
 
-from conftest import ROOT
-
-CHIPS = sorted(path.name for path in (ROOT / "simulator/phones").iterdir())
+from conftest import CHIPS
 
 # The forms of what a reception answers; what is not told is told of the driver-tool families.
 COUNT = r"\d+"
