@@ -2,7 +2,9 @@
 // SPDX-License-Identifier: Apache-2.0
 
 // A service with one fault, which the target test has to find: target-faulty-service FAULT prints
-// "ready" once it is registered. Without a fault it is a phone on which everything works.
+// "ready" once it is registered. Without a fault it is a phone on which everything works; "counts"
+// and "broken-radio" are no faults either, but the answers of other chips and of tools that all
+// fail.
 
 #include <hidl/HidlTransportSupport.h>
 #include <stdio.h>
@@ -85,9 +87,21 @@ void staysBroken(FaultyService& service, const FakeService::Words& call) {
     service.failedOnce = service.failedOnce || holds(call, "abc");
 }
 
+void answersCounts(FaultyService& service, const FakeService::Words& call) {
+    service.text = call[0] == "RunRxAxStart" ? " " : call[0] == "RunRxStop" ? "48  " : "";
+}
+
+void failsInEverything(FaultyService& service, const FakeService::Words& call) {
+    service.number = -1;
+    service.flag = true;
+    service.text = call[0] == "RunRxStop" ? "Rx: goodPackets" : "failure";
+}
+
 // clang-format off
 const std::map<std::string, FaultyService::Fault> kFaults = {
     {"none",           [](FaultyService&, const FakeService::Words&) {}},
+    {"counts",         answersCounts},
+    {"broken-radio",   failsInEverything},
     {"status",         in("RunTxStop", [](auto& service) { service.number = 1; })},
     {"started",        in("RunRxBgStart", [](auto& service) { service.text = "maybe"; })},
     {"ax-started",     in("RunRxAxStart", [](auto& service) { service.text = ""; })},

@@ -104,8 +104,9 @@ def only_line(done):
     return lines[0][len(PROGRAM):]
 
 
-def test_a_service_without_faults(serve):
-    serve("none")
+@pytest.mark.parametrize("healthy", ["none", "counts", "broken-radio"])
+def test_a_service_without_faults(serve, healthy):
+    serve(healthy)
     done = run("--disrupts-wifi")
     assert done.returncode == 0, done.stdout
     assert "DISRUPTS WI-FI" in done.stderr
