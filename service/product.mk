@@ -11,4 +11,5 @@
 
 PRODUCT_PACKAGES_DEBUG += \
     bex-wifi-client \
+    vendor.korvan.bex.wifi@1.0-disruptive-target-test \
     vendor.korvan.bex.wifi@1.0-service

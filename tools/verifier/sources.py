@@ -14,7 +14,7 @@ from verifier import blueprint
 
 # Whose sources all go on a phone. In the other folders a host program may have files of its own.
 PHONE_FOLDERS = ("chips", "client", "recorder", "service", "shell", "sniffer", "suites",
-                 "tests/target", "tests/unit")
+                 "tests/unit")
 FILE_LISTS = ("srcs", "init_rc", "vintf_fragments", "corpus", "data")
 MODULE_LISTS = ("defaults", "static_libs", "header_libs")
 OURS = "bex-wifi-"
