@@ -18,6 +18,23 @@
 namespace android::hardware {
 
 using hidl::base::V1_0::IBase;
+using hidl::manager::V1_0::IServiceManager;
+using hidl::manager::V1_0::IServiceNotification;
+
+namespace {
+
+class ManifestReader : public IServiceManager {
+    Return<Transport> getTransport(const hidl_string& fqName, const hidl_string& name) override {
+        const bool declared = host::isDeclaredInManifest(fqName, name);
+        return declared ? Transport::HWBINDER : Transport::EMPTY;
+    }
+    Return<bool> registerForNotifications(const hidl_string&, const hidl_string&,
+                                          const sp<IServiceNotification>&) override {
+        return false;
+    }
+};
+
+} // namespace
 
 void configureRpcThreadpool(size_t maxThreads, bool callerWillJoin) {
     host::Engine::get().configure(maxThreads, callerWillJoin);
@@ -27,8 +44,8 @@ void joinRpcThreadpool() {
     host::Engine::get().join();
 }
 
-sp<hidl::manager::V1_0::IServiceManager> defaultServiceManager() {
-    return nullptr;
+sp<IServiceManager> defaultServiceManager() {
+    return new ManifestReader;
 }
 
 std::vector<std::string> getAllHalInstanceNames(const std::string& descriptor) {

@@ -5,6 +5,7 @@
 
 #include <hidl/GtestPrinter.h>
 #include <hidl/ServiceManagement.h>
+#include <sys/stat.h>
 
 #include "host/src/Manifest.h"
 #include "tests/host/HostTest.h"
@@ -73,6 +74,16 @@ TEST_F(ManifestTest, Fragments) {
     EXPECT_FALSE(isDeclaredInManifest(IWifiService::descriptor, "default"));
     write("vendor/etc/vintf/manifest/c.xml", manifest("<version>1.0</version>" + kInterface));
     EXPECT_TRUE(isDeclaredInManifest(IWifiService::descriptor, "default"));
+}
+
+TEST_F(ManifestTest, TheServiceManagerTellsTheTransport) {
+    using Transport = ::android::hidl::manager::V1_0::IServiceManager::Transport;
+    const auto manager = ::android::hardware::defaultServiceManager();
+    ASSERT_NE(manager, nullptr);
+    EXPECT_EQ(manager->getTransport(IWifiService::descriptor, "default"), Transport::EMPTY);
+    write("vendor/etc/vintf/manifest.xml", manifest("<version>1.0</version>" + kInterface));
+    EXPECT_EQ(manager->getTransport(IWifiService::descriptor, "default"), Transport::HWBINDER);
+    EXPECT_EQ(manager->getTransport(IWifiService::descriptor, "third"), Transport::EMPTY);
 }
 
 TEST_F(ManifestTest, BrokenFilesAreIgnored) {

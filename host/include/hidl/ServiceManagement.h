@@ -13,7 +13,10 @@
 
 namespace android::hardware {
 
-/** There is no service manager on a host, the file system takes its place: always null. */
+/**
+ * Answers from the VINTF manifest's files. There is no service manager on a host: the file system
+ * takes its place, and lookups do not come by here.
+ */
 sp<hidl::manager::V1_0::IServiceManager> defaultServiceManager();
 
 /**
