@@ -3,8 +3,7 @@
 
 #include "service/ChipChoice.h"
 
-#include <string_view>
-
+#include "chips/ChipFamily.h"
 #include "sniffer/Qca639xSnifferTool.h"
 #include "sniffer/Wcn685xSnifferTool.h"
 #include "suites/BrcmTestSuit.h"
@@ -28,32 +27,29 @@ SnifferTool* sniffer() {
     return new Sniffer();
 }
 
-struct ChipFamily {
-    std::string_view vendor;
-    std::string_view partOfName;
+struct FamilyChoice {
+    ChipFamily family;
     ChipChoice choice;
 };
 
-// The first row that fits wins: a name with WCN or QCA in upper case never gets to the digits. The
-// empty part of a name is in every name.
 // clang-format off
-constexpr ChipFamily kChipFamilies[] = {
-    {"broadcom", "",     {suit<BrcmTestSuit>,    sniffer<SnifferTool>}},
-    {"qcom",     "WCN",  {suit<WcnTestSuit>,     sniffer<SnifferTool>}},
-    {"qcom",     "QCA",  {suit<QcaTestSuit>,     sniffer<SnifferTool>}},
-    {"qcom",     "639x", {suit<Qca639xTestSuit>, sniffer<Qca639xSnifferTool>}},
-    {"qcom",     "685x", {suit<Qca639xTestSuit>, sniffer<Wcn685xSnifferTool>}},
-    {"qcom",     "6750", {suit<Wcn6750TestSuit>, sniffer<Wcn685xSnifferTool>}},
-    {"qcom",     "",     {suit<Wcn39xxTestSuit>, sniffer<SnifferTool>}},
+constexpr FamilyChoice kChoices[] = {
+    {ChipFamily::brcm,    {suit<BrcmTestSuit>,    sniffer<SnifferTool>}},
+    {ChipFamily::wcn,     {suit<WcnTestSuit>,     sniffer<SnifferTool>}},
+    {ChipFamily::qca,     {suit<QcaTestSuit>,     sniffer<SnifferTool>}},
+    {ChipFamily::qca639x, {suit<Qca639xTestSuit>, sniffer<Qca639xSnifferTool>}},
+    {ChipFamily::wcn685x, {suit<Qca639xTestSuit>, sniffer<Wcn685xSnifferTool>}},
+    {ChipFamily::wcn6750, {suit<Wcn6750TestSuit>, sniffer<Wcn685xSnifferTool>}},
+    {ChipFamily::wcn39xx, {suit<Wcn39xxTestSuit>, sniffer<SnifferTool>}},
 };
 // clang-format on
 
 } // namespace
 
 const ChipChoice* chooseChip(const std::string& vendor, const std::string& chip) {
-    for (const ChipFamily& family : kChipFamilies) {
-        const bool fits = chip.find(family.partOfName) != std::string::npos;
-        if (family.vendor == vendor && fits) return &family.choice;
+    const std::optional<ChipFamily> family = chipFamily(vendor, chip);
+    for (const FamilyChoice& row : kChoices) {
+        if (row.family == family) return &row.choice;
     }
     return nullptr;
 }

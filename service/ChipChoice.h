@@ -17,11 +17,8 @@ struct ChipChoice {
 };
 
 /**
- * Chooses what drives a phone's chip.
+ * Chooses what drives a phone's chip, by its family (chips/ChipFamily.h).
  *
- * @param vendor The chip's vendor: exactly "broadcom" or "qcom".
- * @param chip The chip's name. It tells the families of a vendor apart by a part of it, upper and
- *     lower case being different; any name, an empty one too, belongs to one.
  * @return The choice, which lives for the whole process; null when the vendor is unknown.
  */
 const ChipChoice* chooseChip(const std::string& vendor, const std::string& chip);
