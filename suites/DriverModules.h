@@ -10,9 +10,22 @@ namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 // Where the phone keeps the WLAN driver's kernel module.
 
+/** The places of the one module file of a driver, in the order of the search. */
+inline constexpr const char* kFwPathCandidates[] = {
+        "/system/lib/modules/wlan.ko",
+        "/vendor/lib/modules/wlan.ko",
+        "/system/lib/modules/qca_cld3_wlan.ko",
+        "/vendor/lib/modules/qca_cld3_wlan.ko",
+        "/vendor/lib/modules/qca_cld3/qca_cld3_wlan.ko",
+};
+
+/** The module directory of a driver of several files, and how their names begin. */
+inline constexpr const char* kDriverDir = "/vendor/lib/modules";
+inline constexpr const char* kDriverPrefix = "qca_cld3_";
+
 /**
- * Looks for the one module file of the driver in the places where phones have it, and takes the
- * first that can be read.
+ * Looks for the one module file of the driver in kFwPathCandidates, and takes the first that can
+ * be read.
  *
  * @param tag The log tag of the caller.
  * @param fwPath Set to the file's path; stays as it is when there is none.
@@ -21,7 +34,7 @@ namespace vendor::korvan::bex::wifi::V1_0::implementation {
 int findFwPath(const char* tag, std::string* fwPath);
 
 /**
- * Adds every module file of the chip family in the module directory, with an error line for each,
+ * Adds every file in kDriverDir whose name begins with kDriverPrefix, with an error line for each,
  * in the order in which the directory lists them.
  *
  * @param tag The log tag of the caller.
