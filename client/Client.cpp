@@ -15,6 +15,8 @@ namespace vendor::korvan::bex::wifi::client {
 namespace {
 
 constexpr char kList[] = "list";
+constexpr char kDoctor[] = "doctor";
+constexpr std::chrono::seconds kDoctorTimeout(5);
 
 /** A finished call as the user sees it. */
 struct Report {
@@ -78,6 +80,20 @@ std::string milliseconds(std::chrono::nanoseconds duration) {
     return text;
 }
 
+/** The object with the members that end every report. */
+std::string withEnding(JsonObject object, const Report& report) {
+    object.add("exit_code", std::to_string(report.exitCode));
+    if (!report.error.empty()) object.addText("error", report.error);
+    return object.str() + "\n";
+}
+
+/** Prints the text, then why it is not kSuccess. */
+int conclude(const Surroundings& to, const std::string& text, const Report& report) {
+    const int written = print(to, text);
+    if (written != kSuccess) return written;
+    return report.error.empty() ? kSuccess : fail(to, report.exitCode, report.error);
+}
+
 std::string jsonReport(const Request& request, const Outcome& outcome, const Report& report) {
     JsonObject arguments;
     for (size_t i = 0; i < request.values.size(); ++i) {
@@ -103,10 +119,8 @@ std::string jsonReport(const Request& request, const Outcome& outcome, const Rep
             .add("ok", report.exitCode == kSuccess ? "true" : "false")
             .add("value", value);
     if (!exact) object.addText("value_hex", hexDigits(outcome.answer.text));
-    object.add("duration_ms", milliseconds(outcome.duration))
-            .add("exit_code", std::to_string(report.exitCode));
-    if (!report.error.empty()) object.addText("error", report.error);
-    return object.str() + "\n";
+    object.add("duration_ms", milliseconds(outcome.duration));
+    return withEnding(object, report);
 }
 
 Outcome callWatched(const Request& request, const CommandLine& line, const Surroundings& to) {
@@ -129,8 +143,30 @@ int list(const CommandLine& line, const Surroundings& to) {
     return print(to, line.json ? listJson() : listText());
 }
 
+int doctor(const CommandLine& line, const Surroundings& to) {
+    if (line.words.size() > 1) return wrongUsage(to, "doctor takes no arguments");
+    const Checks checks = examine(to.tryFind, to.phone, line.timeout.value_or(kDoctorTimeout));
+    const size_t problems = countProblems(checks);
+    Report report = {kSuccess, ""};
+    if (problems != 0) {
+        report = {kFailed, "the doctor found " + std::to_string(problems) +
+                                   (problems == 1 ? " problem" : " problems") +
+                                   ": each names what to do"};
+    }
+    std::string text = checksText(checks);
+    if (line.json) {
+        JsonObject object;
+        object.add("schema_version", kSchemaVersion)
+                .add("ok", report.exitCode == kSuccess ? "true" : "false")
+                .add("checks", checksJson(checks));
+        text = withEnding(object, report);
+    }
+    return conclude(to, text, report);
+}
+
 int help(const CommandLine& line, const Surroundings& to) {
-    if (line.words.empty() || line.words[0] == kList) return print(to, helpText());
+    const bool method = !line.words.empty() && line.words[0] != kList && line.words[0] != kDoctor;
+    if (!method) return print(to, helpText());
     const Command* command = findCommand(line.words[0]);
     if (command == nullptr) return wrongUsage(to, unknownCommand(line.words[0]));
     return print(to, helpText(*command));
@@ -152,9 +188,7 @@ int call(const CommandLine& line, const Surroundings& to) {
     } else if (outcome.ending == Ending::answered) {
         text = outcome.answer.text + "\n";
     }
-    const int written = print(to, text);
-    if (written != kSuccess) return written;
-    return report.error.empty() ? kSuccess : fail(to, report.exitCode, report.error);
+    return conclude(to, text, report);
 }
 
 } // namespace
@@ -165,6 +199,7 @@ int runClient(const std::vector<std::string>& arguments, const Surroundings& sur
     if (!readCommandLine(arguments, &line, &problem)) return wrongUsage(surroundings, problem);
     if (line.help) return help(line, surroundings);
     if (!line.words.empty() && line.words[0] == kList) return list(line, surroundings);
+    if (!line.words.empty() && line.words[0] == kDoctor) return doctor(line, surroundings);
     return call(line, surroundings);
 }
 

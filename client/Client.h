@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "client/Call.h"
+#include "client/Doctor.h"
 
 // The command line client, without a process around it.
 
@@ -17,7 +18,7 @@ namespace vendor::korvan::bex::wifi::client {
 /** What the client ends with; below 126, so that no shell mistakes one for its own. */
 enum ExitCode {
     kSuccess = 0,
-    /** The service answered -1 or "failure". */
+    /** The service answered -1 or "failure", or the doctor found a problem. */
     kFailed = 1,
     kWrongUsage = 2,
     /** The service cannot be found. */
@@ -44,6 +45,8 @@ struct Surroundings {
     bool terminal = false;
     /** How often that display moves on by one second; only a test has it other than a second. */
     std::chrono::nanoseconds second = std::chrono::seconds(1);
+    /** Where the doctor looks. */
+    PhoneView phone = {};
 };
 
 /**

@@ -11,6 +11,7 @@
 #include <thread>
 
 #include "FakeService.h"
+#include "Gate.h"
 #include "client/Client.h"
 #include "client/Help.h"
 
@@ -175,22 +176,11 @@ TEST_F(ClientTest, ExitCode4WhenTheTransportFails) {
     }
 }
 
-// The worker that a passed deadline leaves behind waits at a gate, which the end of the test opens.
 class ClientDeadlineTest : public ClientTest {
   protected:
-    ~ClientDeadlineTest() override {
-        mRelease.set_value();
-        mEnded.get_future().wait();
-    }
+    void wait() { mGate.wait(); }
 
-    void wait() {
-        mGate.wait();
-        mEnded.set_value_at_thread_exit();
-    }
-
-    std::promise<void> mRelease;
-    std::promise<void> mEnded;
-    const std::shared_future<void> mGate = mRelease.get_future().share();
+    Gate mGate;
 };
 
 TEST_F(ClientDeadlineTest, ExitCode5InTheSearch) {

@@ -1,0 +1,259 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#include "client/PhoneChecks.h"
+
+#include <android-base/properties.h>
+
+#include <cctype>
+#include <cstring>
+
+#include "client/DoctorNeeds.h"
+#include "client/Json.h"
+#include "client/PhoneFiles.h"
+#include "suites/DriverModules.h"
+
+namespace vendor::korvan::bex::wifi::client {
+namespace {
+
+using ::android::base::GetProperty;
+using V1_0::implementation::kDriverDir;
+using V1_0::implementation::kDriverPrefix;
+using V1_0::implementation::kFwPathCandidates;
+
+constexpr char kVendor[] = "ro.hardware.wlan.vendor";
+constexpr char kChip[] = "ro.hardware.wlan.chip";
+constexpr char kMimo[] = "ro.hardware.wlan.mimo";
+
+constexpr char kVendorBin[] = "/vendor/bin/";
+constexpr char kShell[] = "/vendor/bin/sh";
+constexpr char kExecuteDenied[] =
+        "; when it is there and commands still fail, \"execute\" is denied: logcat | grep avc";
+constexpr char kInsmodDenied[] =
+        "; when insmod is refused, the service lacks the capability sys_module, or \"module_load\" "
+        "for the file's label: logcat | grep avc";
+
+// Where a shell looks for a bare name. What lies outside of the first ones a vendor process may not
+// execute, unless its policy makes an exception.
+constexpr const char* kVendorFolders[] = {"/vendor/bin/", "/vendor/xbin/", "/odm/bin/"};
+constexpr const char* kOtherFolders[] = {"/product/bin/", "/system_ext/bin/", "/system/bin/",
+                                         "/system/xbin/"};
+
+Check unseen(const std::string& name, const std::string& path, const FileState& state) {
+    return unknown(name, path + ": " + strerror(state.error), "run this as root");
+}
+
+Check notExecutable(const std::string& name, const std::string& path) {
+    return problem(name, path + " is not an executable file",
+                   "install it with mode 755: chmod 755 " + path);
+}
+
+Check checkVendorProperty(bool known) {
+    const std::string vendor = GetProperty(kVendor, "");
+    if (known) return ok("vendor", std::string(kVendor) + " is " + vendor);
+    const std::string found =
+            std::string(kVendor) + (vendor.empty() ? " is not set" : " is " + jsonString(vendor));
+    return problem("vendor", found + ": the first call ends the service",
+                   "set it to broadcom or qcom in vendor/build.prop, and reboot");
+}
+
+Check checkChipProperty(std::optional<ChipFamily> family) {
+    const std::string chip = GetProperty(kChip, "");
+    const std::string taken = family ? std::string("taken for the family ") + needsOf(*family).name
+                                     : "of no known vendor";
+    if (chip.empty()) {
+        return problem("chip", std::string(kChip) + " is not set: " + taken,
+                       "set it to the chip's name in vendor/build.prop, and reboot");
+    }
+    const std::string found = std::string(kChip) + " is " + jsonString(chip) + ": " + taken;
+    return family ? ok("chip", found) : unknown("chip", found, "mend \"vendor\" first");
+}
+
+Check checkMimoProperty() {
+    const std::string mimo = GetProperty(kMimo, "");
+    return ok("mimo", std::string(kMimo) +
+                              (mimo.empty() ? " is not set" : " is " + jsonString(mimo)) +
+                              ": isMimoSupport answers " + (mimo == "1" ? "true" : "false"));
+}
+
+Check checkShell(const std::string& root) {
+    const FileState state = look(root + kShell);
+    if (state.executable()) return ok("shell", kShell);
+    if (state.exists()) return notExecutable("shell", kShell);
+    if (state.hidden()) return unseen("shell", kShell, state);
+    return problem("shell", std::string(kShell) + " is not there: no command can run",
+                   "build the vendor's shell in: PRODUCT_PACKAGES += sh_vendor");
+}
+
+Check missingTool(const std::string& name, const std::string& tool) {
+    return problem(name, tool + " is not there: calls that use it answer -1 or failure",
+                   "install it in /vendor/bin with mode 755" + std::string(kExecuteDenied));
+}
+
+Check checkPath(const std::string& root, const std::string& path) {
+    const std::string name = "tool " + path;
+    const FileState state = look(root + path);
+    if (state.executable()) return ok(name, path);
+    if (state.exists()) return notExecutable(name, path);
+    if (state.hidden()) return unseen(name, path, state);
+    return missingTool(name, path);
+}
+
+Check checkName(const std::string& root, const std::string& tool) {
+    const std::string name = "tool " + tool;
+    std::string unusable;
+    std::optional<Check> hidden;
+    const auto isIn = [&](const std::string& folder) {
+        const FileState state = look(root + folder + tool);
+        if (unusable.empty() && state.exists() && !state.executable()) unusable = folder + tool;
+        if (state.hidden()) hidden = unseen(name, folder + tool, state);
+        return state.executable();
+    };
+    for (const char* folder : kVendorFolders) {
+        if (isIn(folder)) return ok(name, folder + tool);
+    }
+    for (const char* folder : kOtherFolders) {
+        if (!isIn(folder)) continue;
+        return unknown(name,
+                       "only as " + std::string(folder) + tool +
+                               ", which a vendor process may usually not execute",
+                       "install it in /vendor/bin, or see that a call with it succeeds; refusals "
+                       "are in: logcat | grep avc");
+    }
+    if (!unusable.empty()) return notExecutable(name, unusable);
+    return hidden ? *hidden : missingTool(name, tool);
+}
+
+Check checkModuleCandidates(const std::string& root) {
+    std::string places;
+    std::optional<Check> hidden;
+    for (const char* candidate : kFwPathCandidates) {
+        const FileState state = look(root + candidate);
+        if (state.exists() && (state.mode & 0444) != 0) return ok("module", candidate);
+        if (state.hidden()) hidden = unseen("module", candidate, state);
+        places += (places.empty() ? "" : ", ") + std::string(candidate);
+    }
+    if (hidden) return *hidden;
+    return problem("module", "none can be read of " + places,
+                   "install the driver's module in one of these places and restart the service, "
+                   "which looks for it once");
+}
+
+Check checkModuleFolder(const std::string& root) {
+    const Folder folder = listFolder(root + kDriverDir);
+    if (folder.hidden()) return unseen("module", kDriverDir, {folder.error, 0, 0});
+    std::string modules;
+    for (const std::string& name : folder.names) {
+        if (name.rfind(kDriverPrefix, 0) == 0) modules += (modules.empty() ? "" : ", ") + name;
+    }
+    if (!modules.empty()) return ok("module", std::string(kDriverDir) + ": " + modules);
+    return problem("module", std::string("no ") + kDriverPrefix + "* in " + kDriverDir,
+                   "install the driver's modules there and restart the service, which looks for "
+                   "them once");
+}
+
+/** A file that comes and goes with a module of the driver. */
+Check checkParameter(const std::string& root, const DriverFile& file) {
+    const std::string name = std::string("file ") + file.path;
+    const FileState state = look(root + file.path);
+    if (state.hidden()) return unseen(name, file.path, state);
+    if (state.exists()) {
+        if ((state.mode & 0222) != 0) return ok(name, "there");
+        return problem(name, "nobody may write it",
+                       std::string("use a build of the driver ") + file.module +
+                               " whose parameter is writable");
+    }
+    const std::string module = std::string("/sys/module/") + file.module;
+    if (look(root + module).exists()) {
+        return problem(name, "the driver " + std::string(file.module) + " is loaded and lacks it",
+                       "use a build of the driver with this parameter");
+    }
+    const std::string absent = std::string("the driver ") + file.module + " is not loaded";
+    if (file.comesAndGoes) {
+        return unknown(name, absent,
+                       "it comes with the driver: turn Wi-Fi on, or insmod, and look "
+                       "again" +
+                               std::string(kInsmodDenied));
+    }
+    return problem(name, absent, "load it, no call does" + std::string(kInsmodDenied));
+}
+
+Check checkImage(const std::string& root, const std::string& path) {
+    const FileState state = look(root + path);
+    if (state.hasContent()) return ok("file " + path, std::to_string(state.size) + " bytes");
+    if (state.hidden()) return unseen("file " + path, path, state);
+    return problem("file " + path, state.exists() ? "empty, or no file" : "not there",
+                   "install the chip's firmware image under this name");
+}
+
+/**
+ * The property that keeps a tag's debug lines out of the log: the first that is set decides. Empty
+ * when they are logged.
+ */
+std::string debugHiddenBy(const std::string& tag) {
+    for (const std::string& name : {"persist.log.tag." + tag, "log.tag." + tag,
+                                    std::string("persist.log.tag"), std::string("log.tag")}) {
+        const std::string level = GetProperty(name, "");
+        const int letter = level.empty() ? 0 : toupper(static_cast<unsigned char>(level[0]));
+        if (letter == 'V' || letter == 'D') return "";
+        if (letter != 0 && strchr("IWEFAS", letter) != nullptr) return name;
+    }
+    return "";
+}
+
+} // namespace
+
+std::optional<ChipFamily> phoneFamily() {
+    return chipFamily(GetProperty(kVendor, ""), GetProperty(kChip, ""));
+}
+
+Checks checkProperties(std::optional<ChipFamily> family) {
+    return {checkVendorProperty(family.has_value()), checkChipProperty(family),
+            checkMimoProperty()};
+}
+
+Checks checkTools(const std::string& root, std::optional<ChipFamily> family) {
+    Checks checks = {checkShell(root)};
+    if (!family) {
+        checks.push_back(
+                unknown("tools", "which ones depends on the chip", "mend \"vendor\" first"));
+        return checks;
+    }
+    const FamilyNeeds& needs = needsOf(*family);
+    for (const char* tool : needs.byPath)
+        checks.push_back(checkPath(root, kVendorBin + std::string(tool)));
+    for (const char* tool : needs.byName) checks.push_back(checkName(root, tool));
+    return checks;
+}
+
+Checks checkDriver(const std::string& root, std::optional<ChipFamily> family) {
+    if (!family) {
+        return {unknown("driver", "its files depend on the chip", "mend \"vendor\" first")};
+    }
+    const FamilyNeeds& needs = needsOf(*family);
+    Checks checks;
+    if (needs.modules == Modules::oneOfSeveral) checks.push_back(checkModuleCandidates(root));
+    if (needs.modules == Modules::allOfAFolder) checks.push_back(checkModuleFolder(root));
+    for (const DriverFile& file : needs.files) {
+        const bool always = *file.module == '\0';
+        checks.push_back(always ? checkImage(root, file.path) : checkParameter(root, file));
+    }
+    return checks;
+}
+
+Check checkCommandLog() {
+    std::string found;
+    std::string remedy;
+    for (const std::string& tag : kCommandTags) {
+        const std::string cause = debugHiddenBy(tag);
+        if (cause.empty()) continue;
+        const std::string persistent = "persist.log.tag." + tag;
+        if (found.empty()) found = cause + " is " + jsonString(GetProperty(cause, "")) + ": ";
+        remedy += std::string(remedy.empty() ? "" : "; ") + "setprop " +
+                  (cause == persistent ? persistent : "log.tag." + tag) + " D";
+    }
+    if (remedy.empty()) return ok("command-log", "logcat | grep 'cmd:' shows which commands run");
+    return problem("command-log", found + "the log does not show all commands that run", remedy);
+}
+
+} // namespace vendor::korvan::bex::wifi::client

@@ -1,0 +1,142 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+// What the doctor looks for is what the command lines of all operations use.
+
+#include <android-base/properties.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <regex>
+#include <set>
+#include <sstream>
+
+#include "client/Commands.h"
+#include "client/DoctorNeeds.h"
+#include "recorder/RecordedShell.h"
+#include "service/WifiService.h"
+
+namespace vendor::korvan::bex::wifi::client {
+namespace {
+
+using ::android::sp;
+using ::android::base::SetProperty;
+using Words = std::set<std::string>;
+
+struct Phone {
+    const char* vendor;
+    const char* chip;
+    ChipFamily family;
+};
+
+std::ostream& operator<<(std::ostream& out, const Phone& phone) {
+    return out << phone.vendor << ' ' << phone.chip;
+}
+
+constexpr Phone kPhones[] = {
+        {"broadcom", "bcm4375", ChipFamily::brcm}, {"qcom", "WCN3990", ChipFamily::wcn},
+        {"qcom", "QCA6174", ChipFamily::qca},      {"qcom", "qca639x", ChipFamily::qca639x},
+        {"qcom", "wcn685x", ChipFamily::wcn685x},  {"qcom", "wcn6750", ChipFamily::wcn6750},
+        {"qcom", "wcn3950", ChipFamily::wcn39xx},
+};
+
+constexpr char kModule[] = "/vendor/lib/modules/wlan.ko";
+constexpr char kModules[] = "/vendor/lib/modules/qca_cld3_x.ko";
+
+class DoctorNeedsTest : public ::testing::TestWithParam<Phone> {
+  protected:
+    DoctorNeedsTest() {
+        SetProperty("ro.hardware.wlan.vendor", GetParam().vendor);
+        SetProperty("ro.hardware.wlan.chip", GetParam().chip);
+        mShell.readable(kModule);
+        mShell.directory("/vendor/lib/modules", {"qca_cld3_x.ko"});
+        const sp<IWifiService> service = new V1_0::implementation::WifiService();
+        for (const Command& command : commands()) {
+            for (const char* text : {"6", "36", "40"}) {
+                for (const bool flag : {false, true}) {
+                    const std::vector<Value> values(command.arguments.size(), {text, flag});
+                    EXPECT_TRUE(command.call(*service, values).delivered);
+                }
+            }
+        }
+    }
+
+    ~DoctorNeedsTest() override {
+        SetProperty("ro.hardware.wlan.vendor", "");
+        SetProperty("ro.hardware.wlan.chip", "");
+    }
+
+    /** The first word of each command of each line, without the shell's own commands. */
+    Words tools() const {
+        Words tools;
+        for (const std::string& line : mShell.lines()) {
+            std::istringstream commands(line);
+            for (std::string command; std::getline(commands, command, '|');) {
+                std::istringstream(command) >> command;
+                if (command != "echo") tools.insert(command);
+            }
+        }
+        return tools;
+    }
+
+    Words matches(const std::string& pattern) const {
+        Words found;
+        for (const std::string& line : mShell.lines()) {
+            const std::regex expression(pattern);
+            for (std::sregex_iterator it(line.begin(), line.end(), expression), end; it != end;
+                 ++it) {
+                found.insert(it->str());
+            }
+        }
+        return found;
+    }
+
+    const FamilyNeeds& mNeeds = needsOf(GetParam().family);
+    recorder::RecordedShell mShell;
+};
+
+TEST_P(DoctorNeedsTest, TheTools) {
+    Words named(mNeeds.byName.begin(), mNeeds.byName.end());
+    for (const char* tool : mNeeds.byPath) named.insert(std::string("/vendor/bin/") + tool);
+    EXPECT_EQ(named, tools());
+    EXPECT_EQ(named.size(), mNeeds.byName.size() + mNeeds.byPath.size());
+}
+
+TEST_P(DoctorNeedsTest, TheDriversFiles) {
+    Words named;
+    for (const DriverFile& file : mNeeds.files) {
+        named.insert(file.path);
+        const std::string module = std::string("/sys/module/") + file.module + "/";
+        EXPECT_EQ(*file.module != '\0', std::string(file.path).rfind(module, 0) == 0) << file.path;
+    }
+    EXPECT_EQ(named, matches("/(sys|etc)/[^ \"]*"));
+}
+
+TEST_P(DoctorNeedsTest, TheModules) {
+    const Words loaded = matches("/[^ ]*\\.ko");
+    switch (mNeeds.modules) {
+        case Modules::none:
+            EXPECT_EQ(loaded, Words{});
+            break;
+        case Modules::oneOfSeveral:
+            EXPECT_EQ(loaded, Words{kModule});
+            break;
+        case Modules::allOfAFolder:
+            EXPECT_EQ(loaded, Words{kModules});
+            break;
+    }
+}
+
+TEST_P(DoctorNeedsTest, TheTagsOfTheCommands) {
+    Words tags;
+    for (const auto& line : mShell.log()) {
+        if (line.text.rfind("cmd: ", 0) == 0) tags.insert(line.tag);
+    }
+    EXPECT_EQ(tags, Words(kCommandTags.begin(), kCommandTags.end()));
+}
+
+INSTANTIATE_TEST_SUITE_P(EveryFamily, DoctorNeedsTest, ::testing::ValuesIn(kPhones),
+                         [](const auto& phone) { return needsOf(phone.param.family).name; });
+
+} // namespace
+} // namespace vendor::korvan::bex::wifi::client
