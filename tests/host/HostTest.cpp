@@ -42,7 +42,8 @@ ServerProcess::ServerProcess(const std::vector<std::string>& steps, int tag) {
     android::base::unique_fd gate;
     makePipe(&mEvents, &events);
     makePipe(&gate, &mGate);
-    std::vector<std::string> words = {HIDL_TEST_SERVER, "3", "4", std::to_string(tag)};
+    std::vector<std::string> words = kServerCommand;
+    words.insert(words.end(), {"3", "4", std::to_string(tag)});
     words.insert(words.end(), steps.begin(), steps.end());
     std::vector<char*> arguments;
     for (std::string& word : words) arguments.push_back(word.data());
@@ -58,7 +59,7 @@ ServerProcess::ServerProcess(const std::vector<std::string>& steps, int tag) {
         dup2(gateHigh, 4);
         // Whatever this process was itself born with.
         close_range(5, ~0u, 0);
-        execv(arguments[0], arguments.data());
+        execvp(arguments[0], arguments.data());
         _exit(127);
     }
 }

@@ -18,11 +18,17 @@ using ::android::status_t;
 using ::android::wp;
 using V1_0::IWifiService;
 
+/** Whether an emulator runs the tests and their servers, with threads and memory of its own. */
+constexpr bool kEmulated = HIDL_TEST_EMULATED;
+
 /** What Return::description() tells of a transport's failure: transportFailure("DEAD_OBJECT"). */
 std::string transportFailure(const std::string& error);
 
 /** RunRxStop(script): its text, or the description of its failure. */
 std::string call(const sp<IWifiService>& service, const std::string& script);
+
+/** The words that start hidl-test-server; its own arguments follow. */
+const std::vector<std::string> kServerCommand = {HIDL_TEST_SERVER};
 
 /** A process of hidl-test-server, whose steps it runs. Killed when the object goes. */
 class ServerProcess {

@@ -61,10 +61,12 @@ inline std::string rangeMessage(size_t index, size_t size) {
     return "";
 }
 
-/** Runs `code` in a process of its own, where no suite has found a driver yet. */
+/**
+ * Runs `code` in a process of its own, where no suite has found a driver yet: in a test whose class
+ * is called ...DeathTest, since those run before all others and the process is a fork of theirs.
+ */
 template <typename Code>
 void inFreshProcess(Code code) {
-    ::testing::GTEST_FLAG(death_test_style) = "threadsafe";
     EXPECT_EXIT(
             {
                 code();
