@@ -90,6 +90,8 @@ def test_a_phone_until_ctrl_c(dev, phones):
     (["demo", "acme"], "dev: no phone for the chip 'acme': there is broadcom"),
     (["explain", "broadcom", "RunTxStop"], "explain: RunTxStop takes 1 argument"),
     (["explain", "broadcom", "runtxstop", "6"], "explain: unknown method"),
+    (["test", "--arch"], "dev: which architecture? There is --arch arm64"),
+    (["test", "--arch", "mips"], "dev: which architecture? There is --arch arm64"),
     (["start"], "dev: there is no command 'start': see ./dev help"),
 ])
 def test_wrong_usage_is_one_line(dev, arguments, message):
