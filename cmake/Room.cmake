@@ -11,28 +11,37 @@ function(room name)
     target_link_libraries(${name} PUBLIC ${ROOM_DEPENDS})
 endfunction()
 
-# program(<name> SOURCES <files>... DEPENDS <targets>...): an executable under the same rules.
+# program(<name> [STANDALONE] SOURCES <files>... DEPENDS <targets>...): an executable under the same
+# rules. One that needs none of the platform's C++ libraries is STANDALONE; the others are only objects
+# where OTHER_CXX_LIBRARY is set.
 function(program name)
-    cmake_parse_arguments(PROGRAM "" "" "SOURCES;DEPENDS" ${ARGN})
-    add_executable(${name} ${PROGRAM_SOURCES})
+    cmake_parse_arguments(PROGRAM "STANDALONE" "" "SOURCES;DEPENDS" ${ARGN})
+    if(OTHER_CXX_LIBRARY AND NOT PROGRAM_STANDALONE)
+        add_library(${name} OBJECT ${PROGRAM_SOURCES})
+    else()
+        add_executable(${name} ${PROGRAM_SOURCES})
+    endif()
     target_compile_options(${name} PRIVATE ${ROOM_WARNINGS})
     target_link_libraries(${name} PRIVATE ${PROGRAM_DEPENDS})
 endfunction()
 
-# unit_test(<name> SOURCES <files>... DEPENDS <targets>...): a GoogleTest program, each test known to
-# CTest by itself.
+# unit_test(<name> [STANDALONE] SOURCES <files>... DEPENDS <targets>...): a GoogleTest program, each
+# test known to CTest by itself.
 function(unit_test name)
     program(${name} ${ARGN})
     target_link_libraries(${name} PRIVATE GTest::gmock_main)
-    gtest_discover_tests(
-        ${name} TEST_PREFIX ${name}. DISCOVERY_MODE PRE_TEST PROPERTIES TIMEOUT 60
-    )
+    get_target_property(type ${name} TYPE)
+    if(type STREQUAL EXECUTABLE)
+        gtest_discover_tests(
+            ${name} TEST_PREFIX ${name}. DISCOVERY_MODE PRE_TEST PROPERTIES TIMEOUT 60
+        )
+    endif()
 endfunction()
 
 # process_test(<name> <file>... [TIMEOUT <seconds>] [ENVIRONMENT <NAME=value>...]): pytest files that
 # drive whole programs. Left out where there are none that this machine runs as they stand.
 function(process_test name)
-    if(CMAKE_CROSSCOMPILING)
+    if(OTHER_CXX_LIBRARY OR CMAKE_CROSSCOMPILING)
         return()
     endif()
     cmake_parse_arguments(TEST "" "TIMEOUT" "ENVIRONMENT" ${ARGN})
