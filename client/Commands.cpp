@@ -85,10 +85,14 @@ Answer answer(const Return<T>& result) {
 template <typename Call>
 Answer answerText(Call call) {
     std::optional<std::string> text;
-    const Return<void> result =
-            call([&text](const hidl_string& out) { text.emplace(out.c_str(), out.size()); });
+    bool again = false;
+    const Return<void> result = call([&](const hidl_string& out) {
+        again = text.has_value();
+        text.emplace(out.c_str(), out.size());
+    });
     if (!result.isOk()) return {false, "", result.description()};
     if (!text) return {false, "", "the method returned without an answer"};
+    if (again) return {false, "", "the method answered more than once"};
     return {true, *text, ""};
 }
 

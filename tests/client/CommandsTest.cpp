@@ -119,6 +119,13 @@ TEST_F(CommandsTest, AMethodThatNeverAnswersHasNotDelivered) {
     EXPECT_EQ(answer.transportError, "the method returned without an answer");
 }
 
+TEST_F(CommandsTest, AMethodThatAnswersTwiceHasNotDelivered) {
+    mService->doubled = true;
+    const Answer answer = callWith({"RunRxStop", "6"}, *mService);
+    EXPECT_FALSE(answer.delivered);
+    EXPECT_EQ(answer.transportError, "the method answered more than once");
+}
+
 TEST_F(CommandsTest, ArgumentsAndTextsPassByteForByte) {
     std::string everyByte;
     for (int byte = 0; byte < 256; ++byte) everyByte += static_cast<char>(byte);

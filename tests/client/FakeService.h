@@ -26,6 +26,8 @@ class FakeService : public V1_0::IWifiService {
     bool broken = false;
     /** A method with a text leaves its callback alone. */
     bool silent = false;
+    /** A method with a text calls its callback twice. */
+    bool doubled = false;
     /** Runs in each call, on its thread; the answer may be set here. */
     std::function<void()> onCall = [] {};
     std::function<void()> onDestroyed = [] {};
@@ -121,6 +123,7 @@ class FakeService : public V1_0::IWifiService {
         onCall();
         if (broken) return deadObject();
         if (!silent) keep(text);
+        if (doubled) keep(text);
         return ::android::hardware::Void();
     }
 };
