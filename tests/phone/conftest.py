@@ -32,16 +32,17 @@ def wait_for(condition):
 
 
 class Phone:
-    """One phone; `folder` is where it lives on this machine."""
+    """One phone; `folder` is where it lives on this machine, `installs` are SRC=DEST texts."""
 
-    def __init__(self, chip, folder, *options):
+    def __init__(self, chip, folder, *installs):
         self.folder = folder
         self.root = folder / "root"
         self.log = folder / "log"
         self.phone("create", chip, folder,
                    "--install", f"{os.environ['BEX_SERVICE']}=/vendor/bin/hw/{SERVICE}",
                    "--install", f"{ROOT}/service/{SERVICE}.xml=/vendor/etc/vintf/manifest/{SERVICE}.xml",
-                   "--install", f"{os.environ['BEX_CLIENT']}={CLIENT}", *options)
+                   "--install", f"{os.environ['BEX_CLIENT']}={CLIENT}",
+                   *(f"--install={pair}" for pair in installs))
 
     @staticmethod
     def phone(*arguments):
@@ -88,8 +89,8 @@ def make_phone_fixture():
     # A short path: in a deep folder the phone would borrow another place for its sockets.
     with tempfile.TemporaryDirectory(prefix="bex-") as folder:
 
-        def make(chip, *options):
-            made.append(Phone(chip, pathlib.Path(folder, str(len(made))), *options))
+        def make(chip, *installs):
+            made.append(Phone(chip, pathlib.Path(folder, str(len(made))), *installs))
             return made[-1]
 
         yield make

@@ -17,7 +17,7 @@ TARGET_TEST = "/data/vendor.korvan.bex.wifi@1.0-disruptive-target-test"
 
 @pytest.mark.parametrize("chip", CHIPS)
 def test_a_phone_passes_and_stays_usable(make_phone, chip):
-    phone = make_phone(chip, "--install", f"{os.environ['BEX_TARGET_TEST']}={TARGET_TEST}")
+    phone = make_phone(chip, f"{os.environ['BEX_TARGET_TEST']}={TARGET_TEST}")
     # The pauses that a real driver needs would take minutes.
     phone.fault("sleep", "print", "/dev/null")
     phone.up()
