@@ -85,6 +85,34 @@ def test_a_phone_until_ctrl_c(dev, phones):
         3, "dev: no phone is up: start one with ./dev phone CHIP\n")
 
 
+def test_a_short_soak(dev, phones):
+    soak = dev("soak", "0.1", "7")
+    assert soak.returncode == 0, soak.stdout + soak.stderr
+    lines = soak.stdout.splitlines()
+    assert lines[0] == "soak: 0.1 minutes, seed 7"
+    heads = re.split(" {2,}", lines[1].strip())
+    totals = dict(zip(heads, map(int, lines[-1].split()[1:])))
+    assert totals["calls"] == totals["answered"] + totals["cut off"] > 0
+    assert totals["wrong"] == totals["lost"] == totals["grown"] == 0
+    assert list(phones.iterdir()) == []
+    assert processes_of(phones) == []
+
+
+def test_a_soak_until_ctrl_c(phones):
+    with subprocess.Popen(
+            [ROOT / "dev", "soak"], stdout=subprocess.PIPE, text=True,
+            env={**os.environ, "BEX_PHONES": str(phones)}, start_new_session=True) as soak:
+        assert soak.stdout.readline().startswith("soak: 60 minutes, seed ")
+        soak.stdout.readline()  # the heads of the columns: the first calls are on their way
+        os.killpg(soak.pid, signal.SIGINT)
+        rest = soak.stdout.read()
+        assert soak.wait(60) == 0
+    assert rest.startswith("\nsoak: broken off\n")
+    assert rest.splitlines()[-1].split()[0] == "all"
+    assert list(phones.iterdir()) == []
+    assert processes_of(phones) == []
+
+
 @pytest.mark.parametrize("arguments, message", [
     (["phone"], "dev: which chip? One of: broadcom"),
     (["demo", "acme"], "dev: no phone for the chip 'acme': there is broadcom"),
@@ -92,6 +120,8 @@ def test_a_phone_until_ctrl_c(dev, phones):
     (["explain", "broadcom", "runtxstop", "6"], "explain: unknown method"),
     (["test", "--arch"], "dev: which architecture? There is --arch arm64"),
     (["test", "--arch", "mips"], "dev: which architecture? There is --arch arm64"),
+    (["soak", "soon"], "dev: MINUTES is a number like 60 or 0.5, not 'soon'"),
+    (["soak", "1", "2", "3"], "dev: soak takes MINUTES and SEED at most"),
     (["start"], "dev: there is no command 'start': see ./dev help"),
 ])
 def test_wrong_usage_is_one_line(dev, arguments, message):
