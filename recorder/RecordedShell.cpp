@@ -35,7 +35,7 @@ struct Recording {
     std::vector<std::string> lines;
     std::vector<RecordedShell::LogLine> log;
     // Running commands: each stream reads from the text beside it.
-    std::map<FILE*, RecordedShell::Answer> running;
+    std::map<FILE*, std::unique_ptr<RecordedShell::Answer>> running;
     std::set<std::string> readable;
     std::vector<std::string> probed;
     std::map<std::string, std::vector<std::string>> directories;
@@ -60,23 +60,24 @@ FILE* start(const std::string& line) {
         errno = EAGAIN;
         return nullptr;
     }
-    FILE* stream = tmpfile();
-    if (stream == nullptr) return nullptr;
-    fwrite(answer.output.data(), 1, answer.output.size(), stream);
-    rewind(stream);
-    gRecording.running[stream] = std::move(answer);
+    auto running = std::make_unique<RecordedShell::Answer>(std::move(answer));
+    std::string& output = running->output;
+    // Not every C library opens an empty piece of memory.
+    FILE* stream =
+            output.empty() ? fopen("/dev/null", "r") : fmemopen(output.data(), output.size(), "r");
+    if (stream != nullptr) gRecording.running[stream] = std::move(running);
     return stream;
 }
 
 int finish(FILE* stream) {
-    int status;
+    std::unique_ptr<RecordedShell::Answer> answer;
     {
         const std::lock_guard lock(gMutex);
-        status = gRecording.running.at(stream).status;
+        answer = std::move(gRecording.running.at(stream));
         gRecording.running.erase(stream);
     }
     fclose(stream);
-    return status;
+    return answer->status;
 }
 
 /** The function of the C library that `ours` stands in front of. */
