@@ -79,8 +79,8 @@ class VendorTestSuit {
 
     /**
      * Replaces the first `from` in `src` by `to`, again and again from the start, until there is
-     * none: ("a-b-c", "-", " ") gives "a b c". Does not end when `to` contains `from` or `from` is
-     * empty.
+     * none: ("a-b-c", "-", " ") gives "a b c". Does not end when `from` is empty, when it stands in
+     * both `src` and `to`, and for pairs that bring it about ever again: ("aab", "ab", "bbaa").
      */
     virtual std::string replaceSubString(const std::string& src, const std::string& from,
                                          const std::string& to);
