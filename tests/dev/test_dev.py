@@ -122,6 +122,13 @@ def test_a_soak_until_ctrl_c(phones):
     (["test", "--arch", "mips"], "dev: which architecture? There is --arch arm64"),
     (["soak", "soon"], "dev: MINUTES is a number like 60 or 0.5, not 'soon'"),
     (["soak", "1", "2", "3"], "dev: soak takes MINUTES and SEED at most"),
+    (["fuzz", "acme"], "dev: no fuzz target 'acme': there is framing"),
+    (["fuzz", "../corpus/tools"], "dev: no fuzz target '../corpus/tools'"),
+    (["fuzz", "framing operations"], "dev: no fuzz target 'framing operations'"),
+    (["fuzz", ""], "dev: no fuzz target ''"),
+    (["fuzz", "tools", "soon"], "dev: 'soon' is no number of seconds"),
+    (["fuzz", "tools", "0"], "dev: '0' is no number of seconds"),
+    (["fuzz", "tools", "1", "2"], "dev: fuzz takes a target and"),
     (["start"], "dev: there is no command 'start': see ./dev help"),
 ])
 def test_wrong_usage_is_one_line(dev, arguments, message):
