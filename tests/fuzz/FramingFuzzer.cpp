@@ -15,6 +15,7 @@
 
 #include <cstring>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -25,6 +26,7 @@
 #include "recorder/RecordedShell.h"
 #include "service/WifiService.h"
 #include "tests/fuzz/Check.h"
+#include "tests/fuzz/Frames.h"
 #include "tests/fuzz/Input.h"
 #include "tests/fuzz/Wire.h"
 
@@ -44,7 +46,6 @@ using android::hardware::host::FrameReader;
 using android::hardware::host::Receipt;
 using android::hardware::host::Reservation;
 using vendor::korvan::bex::wifi::V1_0::BnHwWifiService;
-using vendor::korvan::bex::wifi::V1_0::IWifiService;
 using vendor::korvan::bex::wifi::V1_0::implementation::WifiService;
 
 constexpr uint32_t kRunTxStop = 9;
@@ -94,34 +95,6 @@ unique_fd memoryWith(const Bytes& bytes) {
     const ssize_t written = write(file.get(), bytes.data(), bytes.size());
     check(written == static_cast<ssize_t>(bytes.size()), "a memory file can be written", "less");
     return file;
-}
-
-/** A call with some texts, as its proxy writes it. */
-Bytes frameOf(uint32_t code, uint32_t flags, const std::vector<std::string>& texts) {
-    const std::vector<hidl_string> arguments(texts.begin(), texts.end());
-    Parcel parcel;
-    parcel.writeInterfaceToken(IWifiService::descriptor);
-    for (const hidl_string& text : arguments) writeText(text, &parcel);
-    FrameHeader header;
-    header.code = code;
-    header.flags = flags;
-    const Bytes payload = payloadOf(parcel, &header).value();
-    Bytes frame(sizeof(header) + payload.size());
-    memcpy(frame.data(), &header, sizeof(header));
-    memcpy(frame.data() + sizeof(header), payload.data(), payload.size());
-    return frame;
-}
-
-/** Any call, patched or not. */
-Bytes readFrame(Input& input) {
-    const auto code = static_cast<uint32_t>(input.number(18));
-    const uint32_t flags[] = {0, 0, 0, FrameHeader::kOneway, FrameHeader::kReply};
-    std::vector<std::string> texts(input.number(7));
-    const uint32_t chosen = input.oneOf(flags);
-    for (std::string& text : texts) text = input.text();
-    Bytes frame = frameOf(code, chosen, texts);
-    patch(input, frame);
-    return frame;
 }
 
 /** Sends a frame's payload beside it, or something else in the payload's place. */
@@ -293,21 +266,16 @@ void readOnce(Input& input, const Parcel& parcel, std::vector<size_t>& handles) 
             return;
     }
     if (status != OK) return;
+    check(parcel.dataPosition() <= parcel.dataSize(), "an object lies in the data",
+          std::to_string(parcel.dataPosition()));
     if (buffer != nullptr) touch(buffer, size);
     if (buffer != nullptr) handles.push_back(handle);
 }
 
-void fuzzReader(Input& input) {
-    const Ends ends = makeEnds();
-    sendNext(input, ends.peer.get());
-    FrameReader reader(ends.server.get());
-    FrameHeader header;
-    Parcel parcel;
-    if (reader.receive(MSG_DONTWAIT, &header, &parcel) != Receipt::kFrame) return;
+/** What was taken is itself a parcel that can be sent on, and may be read in any way. */
+void fuzzParcel(Input& input, const FrameHeader& header, const Parcel& parcel) {
     check(parcel.dataSize() == header.dataSize, "a parcel has the frame's size",
           std::to_string(parcel.dataSize()));
-
-    // What was taken is itself a parcel that can be sent on.
     FrameHeader again;
     const std::optional<Bytes> payload = payloadOf(parcel, &again);
     check(payload && again.dataSize == header.dataSize && again.objectCount == header.objectCount &&
@@ -318,6 +286,31 @@ void fuzzReader(Input& input) {
 
     std::vector<size_t> handles;
     for (int reads = 0; reads < 32 && !input.atEnd(); ++reads) readOnce(input, parcel, handles);
+}
+
+void fuzzReader(Input& input) {
+    const Ends ends = makeEnds();
+    sendNext(input, ends.peer.get());
+    FrameHeader header;
+    Parcel parcel;
+    const Receipt receipt = FrameReader(ends.server.get()).receive(MSG_DONTWAIT, &header, &parcel);
+    if (receipt == Receipt::kFrame) fuzzParcel(input, header, parcel);
+}
+
+void fuzzRules(Input& input) {
+    const Ends ends = makeEnds();
+    Bytes frame = readLayout(input);
+    patch(input, frame);
+    sendMessage(ends.peer.get(), frame);
+    FrameHeader header;
+    Parcel parcel;
+    const Receipt receipt = FrameReader(ends.server.get()).receive(MSG_DONTWAIT, &header, &parcel);
+    const bool taken = receipt == Receipt::kFrame;
+    // One that announces a payload beside it is waited for.
+    if (receipt == Receipt::kNothing) return;
+    check(taken == keepsTheRules(frame), "a frame that keeps the rules is taken, and no other",
+          taken ? "one taken" : "one refused");
+    if (taken) fuzzParcel(input, header, parcel);
 }
 
 size_t openDescriptors() {
@@ -339,11 +332,8 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     target();
     Engine::get();
     const size_t before = openDescriptors();
-    if (input.number(2) == 0) {
-        fuzzConnection(input);
-    } else {
-        fuzzReader(input);
-    }
+    void (*const subjects[])(Input&) = {fuzzConnection, fuzzReader, fuzzRules};
+    input.oneOf(subjects)(input);
     check(openDescriptors() == before, "every descriptor is closed",
           std::to_string(openDescriptors()));
     check(static_cast<bool>(Reservation(android::hardware::host::kTransactionBufferSize)),
