@@ -83,20 +83,21 @@ bool isBase(const Method& method) {
 /** One call, as the input has it: its parcel, and whether a proxy could have written it. */
 class Call {
   public:
-    explicit Call(Input& input) : mInput(input), method(input.oneOf(kMethods)) {
+    explicit Call(Input& input) : mInput(input), mMethod(input.oneOf(kMethods)) {
         writeToken();
-        for (const char* type = method.arguments; *type != '\0'; ++type) writeArgument(*type);
+        for (const char* type = mMethod.arguments; *type != '\0'; ++type) writeArgument(*type);
         if (mInput.number(8) == 7) writeRaw();
     }
 
+    const Method& method() const { return mMethod; }
     Parcel& parcel() { return mParcel; }
     const Arguments& arguments() const { return mArguments; }
     bool isWellFormed() const { return mWellFormed; }
 
   private:
     void writeToken() {
-        const char* const own = isBase(method) ? IBase::descriptor : IWifiService::descriptor;
-        const char* const other = isBase(method) ? IWifiService::descriptor : IBase::descriptor;
+        const char* const own = isBase(mMethod) ? IBase::descriptor : IWifiService::descriptor;
+        const char* const other = isBase(mMethod) ? IWifiService::descriptor : IBase::descriptor;
         switch (mInput.number(16)) {
             case 13:
                 return writeRaw();
@@ -175,6 +176,7 @@ class Call {
     }
 
     Input& mInput;
+    const Method& mMethod;
     Parcel mParcel;
     Arguments mArguments;
     size_t mTexts = 0;
@@ -183,9 +185,6 @@ class Call {
     std::deque<std::string> mBytes;
     std::deque<std::array<uint8_t, 32>> mMemory;
     std::deque<hidl_vec<hidl_string>> mLists;
-
-  public:
-    const Method& method;
 };
 
 /** A reply as the proxy would see it. */
@@ -237,11 +236,11 @@ void checkPassedOn(const Call& call, const Reply& reply, RecordedShell& shell) {
     const std::vector<std::string> lines = shell.lines();
     shell.clear();
     std::string out;
-    const int status = kOperations[call.method.code - kFirstOperation].run(*vendorTestSuit,
-                                                                           call.arguments(), out);
+    const int status = kOperations[call.method().code - kFirstOperation].run(*vendorTestSuit,
+                                                                             call.arguments(), out);
     check(lines == shell.lines(), "a call runs its suite's lines", std::to_string(lines.size()));
     checkEqual(out, reply.text, "a call gives its suite's text");
-    check(call.method.result == 't' || reply.number == status, "a call gives its suite's result",
+    check(call.method().result == 't' || reply.number == status, "a call gives its suite's result",
           std::to_string(reply.number));
 }
 
@@ -263,25 +262,25 @@ void makeCall(Input& input, const sp<BnHwWifiService>& stub, RecordedShell& shel
     int replies = 0;
     Parcel reply;
     Reply result;
-    const status_t status =
-            stub->transact(call.method.code, request, &reply, oneway ? 1 : 0, [&](Parcel& written) {
-                ++replies;
-                result = readReply(call.method, written);
-            });
+    const status_t status = stub->transact(call.method().code, request, &reply, oneway ? 1 : 0,
+                                           [&](Parcel& written) {
+                                               ++replies;
+                                               result = readReply(call.method(), written);
+                                           });
     check(isDocumented(status), "a status is one of IBinder's", std::to_string(status));
     // The stub leaves a reply without a result to the transport, which has it when this returns.
-    if (status == OK && call.method.result == 'v') {
+    if (status == OK && call.method().result == 'v') {
         check(replies == 0, "a reply without a result is sent once", std::to_string(replies + 1));
         ++replies;
-        readReply(call.method, reply);
+        readReply(call.method(), reply);
     }
-    const bool answers = status == OK && call.method.result != '?';
+    const bool answers = status == OK && call.method().result != '?';
     check(replies == (answers ? 1 : 0), "a call that succeeds is answered once, another one never",
           std::to_string(replies));
-    if (!wellFormed || call.method.result == '?') return;
+    if (!wellFormed || call.method().result == '?') return;
     check((status == OK) != oneway, "a proxy's call succeeds unless it does not wait",
           std::to_string(status));
-    const uint32_t code = call.method.code;
+    const uint32_t code = call.method().code;
     if (status == OK && code >= kFirstOperation && code <= kLastOperation) {
         checkPassedOn(call, result, shell);
     }
