@@ -3,13 +3,14 @@
 """Stages faults: writes what simulator/inside/tool, which every tool runs first, reads.
 
 /phone/faults/TOOL          the actions, one a line, in the order in which they happen
-/phone/faults/TOOL.bytes    what `print` prints
+/phone/faults/TOOL.bytesN   what the line `print N` prints
 /phone/faults/TOOL.gate     the fifo at which `wait` waits
 /phone/faults/TOOL.waiting  one line for each tool that has come to the gate
 /phone/missing/TOOL         where a missing tool is kept
 """
 
 import errno
+import glob
 import os
 import re
 import shutil
@@ -45,7 +46,7 @@ class Fault:
         self.program = f"{root}/vendor/bin/{tool}"
         self.hidden = f"{root}/phone/missing/{tool}"
         self.path = f"{root}/phone/faults/{tool}"
-        self.print_from = None
+        self.printed = []
         if not tool or "/" in tool or not (self._obeys(self.program) or self._obeys(self.hidden)):
             raise PhoneError(f"'{tool}' is no tool of this phone that faults can be staged for")
 
@@ -76,14 +77,14 @@ class Fault:
             elif word == "signal" and argument.isdecimal() and 1 <= int(argument) <= 64:
                 yield f"signal {int(argument)}\n"
             elif word == "print" and os.path.exists(argument) and not os.path.isdir(argument):
-                self.print_from = argument
-                yield "print\n"
+                self.printed.append(argument)
+                yield f"print {len(self.printed)}\n"
             else:
                 raise PhoneError(f"fault {self.tool}: cannot '{word} {argument}'")
 
     def write(self, lines):
-        if self.print_from is not None:
-            with open(self.print_from, "rb") as source, open(f"{self.path}.bytes", "wb") as copy:
+        for number, path in enumerate(self.printed, 1):
+            with open(path, "rb") as source, open(f"{self.path}.bytes{number}", "wb") as copy:
                 shutil.copyfileobj(source, copy)
         if "wait\n" in lines:
             os.mkfifo(f"{self.path}.gate")
@@ -95,8 +96,9 @@ class Fault:
         """Back to normal; tools at the gate go on."""
         _remove(self.path)
         self._open_gate()
-        for suffix in (".gate", ".waiting", ".bytes"):
-            _remove(self.path + suffix)
+        for path in [f"{self.path}.gate", f"{self.path}.waiting",
+                     *glob.glob(glob.escape(self.path) + ".bytes*")]:
+            _remove(path)
         if os.path.exists(self.hidden):
             os.rename(self.hidden, self.program)
 

@@ -31,7 +31,7 @@ KINDS = ("bwrap", "proot")
 PR_SET_CHILD_SUBREAPER = 36  # from <linux/prctl.h>
 CAP_SETPCAP = 8  # from <linux/capability.h>
 LONGEST_SOCKET_FOLDER = 36  # leaves 71 bytes for /hidl/ and the name of a socket
-DEVICES = {"null": (1, 3), "zero": (1, 5), "random": (1, 8), "urandom": (1, 9)}
+DEVICES = {"null": (1, 3), "zero": (1, 5), "full": (1, 7), "random": (1, 8), "urandom": (1, 9)}
 
 # The shell reports what cannot be run as adb's does: 127 not found, 126 not executable. proot takes
 # death by a signal for success, so there the shell stays to turn it into 128 + n.

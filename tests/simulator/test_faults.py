@@ -69,6 +69,21 @@ def test_only_calls_that_match_fail(phone):
     assert phone.run("wl", "phy_watchdog", "0").returncode == 0
 
 
+def test_the_first_group_that_matches_counts(phone, place):
+    for text in ("one", "two"):
+        (place / text).write_text(text)
+    phone.fault("wl", "--when", "up", "signal", 9, "--when", "mpc ?", "print", place / "one",
+                "--when", "mpc*", "print", place / "two", "exit", 8, "--when", "*", "exit", 0)
+    assert phone.run("wl", "up").returncode == 137
+    for call, answer in (("mpc 0", (0, "one")), ("mpc", (8, "two")), ("down", (0, ""))):
+        result = phone.run("wl", *call.split())
+        assert (result.returncode, result.stdout) == answer, call
+    phone.fault("wl", "exit", 6, "--when", "*", "exit", 7)  # what stands before a group is for all
+    assert phone.run("wl", "up").returncode == 6
+    phone.fault("wl", "clear")
+    assert os.listdir(phone.root / "phone/faults") == []
+
+
 def test_a_slow_tool_does_its_work_in_the_end(phone):
     phone.output("ifconfig wlan0 up")
     phone.fault("wl", "sleep", "0.01")

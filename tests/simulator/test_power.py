@@ -148,8 +148,9 @@ def test_commands_have_the_phone_s_environment_and_no_descriptors(any_new_phone,
 
 def test_the_devices_work(any_new_phone):
     assert any_new_phone.output("cat /dev/null; echo x > /dev/null; "
+                            "echo x 2>/dev/null >/dev/full || echo full; "
                             "head -c 3 /dev/zero | wc -c; head -c 3 /dev/urandom | wc -c; "
-                            "cat /dev/null") == "3\n3"
+                            "cat /dev/null") == "full\n3\n3"
 
 
 def test_an_unknown_sandbox_is_refused(phone):
