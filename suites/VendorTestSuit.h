@@ -79,8 +79,11 @@ class VendorTestSuit {
 
     /**
      * Replaces the first `from` in `src` by `to`, again and again from the start, until there is
-     * none: ("a-b-c", "-", " ") gives "a b c". Does not end when `from` is empty, when it stands in
-     * both `src` and `to`, and for pairs that bring it about ever again: ("aab", "ab", "bbaa").
+     * none: ("a-b-c", "-", " ") gives "a b c", ("aaaab", "ab", "b") gives "b". Takes time in
+     * proportion to the text and the number of replacements.
+     *
+     * Does not end where every replacement makes room for another one: when `from` is in `src` and
+     * also in `to`, as an empty `from` always is, and for some other pairs, such as "ab" by "bbaa".
      */
     virtual std::string replaceSubString(const std::string& src, const std::string& from,
                                          const std::string& to);

@@ -69,6 +69,20 @@ TEST_F(ReceptionTest, FindsTheGoodPackets) {
 
 // clang-format on
 
+TEST_F(ReceptionTest, SplitsNoFieldsBehindTheCount) {
+    class SplittingSuit : public BrcmTestSuit {
+      public:
+        std::vector<std::string> splitString(const std::string& str,
+                                             const std::string& sep) override {
+            mSplit.push_back(str);
+            return BrcmTestSuit::splitString(str, sep);
+        }
+        std::vector<std::string> mSplit;
+    } suit;
+    EXPECT_EQ("12", goodPackets(suit, "tag", 1, "x goodPackets 12 badPackets 3 y"));
+    EXPECT_THAT(suit.mSplit, ElementsAre("goodPackets 12 "));
+}
+
 TEST_F(ReceptionTest, ReadsTheStatisticsLineByLine) {
     EXPECT_EQ("Rx: 100", receivedText(mSuit, "tag", 1, "goodPackets 100\nbadPackets 2\n"));
     EXPECT_EQ("Rx: 77", receivedText(mSuit, "tag", 1, "goodPackets 5\nx\ngoodPackets 77\n"));

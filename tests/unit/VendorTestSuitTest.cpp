@@ -1,6 +1,8 @@
 // Copyright 2026 The BEX Wi-Fi Authors
 // SPDX-License-Identifier: Apache-2.0
 
+#include <optional>
+
 #include "suites/VendorTestSuit.h"
 #include "tests/unit/Expect.h"
 
@@ -61,6 +63,49 @@ TEST(VendorTestSuitTest, ReplacesWhatAReplacementBringsTogether) {
     BareSuit suit;
     EXPECT_EQ("", suit.replaceSubString("aabb", "ab", ""));
     EXPECT_EQ("b", suit.replaceSubString("aaaab", "ab", "b"));
+}
+
+/** replaceSubString as its contract words it; nothing when that takes too many steps to end. */
+std::optional<std::string> replacedStepByStep(std::string text, const std::string& from,
+                                              const std::string& to) {
+    for (int steps = 0; steps < 100; ++steps) {
+        const size_t pos = text.find(from);
+        if (pos == std::string::npos) return text;
+        text.replace(pos, from.size(), to);
+    }
+    return std::nullopt;
+}
+
+/** Every text of 'a' and 'b' with a length within the limits. */
+std::vector<std::string> textsOfLength(size_t least, size_t most) {
+    std::vector<std::string> texts;
+    for (size_t length = least; length <= most; ++length) {
+        for (unsigned bits = 0; bits < 1u << length; ++bits) {
+            std::string text;
+            for (size_t i = 0; i < length; ++i) text += (bits >> i & 1) != 0 ? 'b' : 'a';
+            texts.push_back(text);
+        }
+    }
+    return texts;
+}
+
+TEST(VendorTestSuitTest, ReplacesAsIfStepByStep) {
+    BareSuit suit;
+    const std::vector<std::string> replacements = textsOfLength(0, 3);
+    size_t compared = 0;
+    for (const std::string& src : textsOfLength(0, 7)) {
+        for (const std::string& from : textsOfLength(1, 3)) {
+            for (const std::string& to : replacements) {
+                const auto expected = replacedStepByStep(src, from, to);
+                if (!expected) continue;
+                ASSERT_EQ(*expected, suit.replaceSubString(src, from, to))
+                        << src << ": " << from << " by " << to;
+                ++compared;
+            }
+        }
+    }
+    // Most pairs end.
+    EXPECT_GT(compared, 35'000u);
 }
 
 TEST(VendorTestSuitTest, SplitsAtEverySeparator) {
