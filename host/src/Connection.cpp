@@ -29,9 +29,12 @@ void Listener::onReady() {
                 TEMP_FAILURE_RETRY(accept4(socket(), nullptr, nullptr, SOCK_CLOEXEC)));
         if (!client.ok()) {
             if (errno == ECONNABORTED) continue;
-            if (errno != EAGAIN) ALOGE("accept: %s", strerror(errno));
-            return;
+            if (errno == EAGAIN) return;
+            // Out of descriptors, say: the client waits. Nobody announces it a second time.
+            if (!mRefused.exchange(true)) ALOGE("accept: %s", strerror(errno));
+            return Engine::get().retry(id());
         }
+        mRefused = false;
         if (!isTrustedPeer(client.get())) {
             ALOGW("A client of another user was turned away");
         } else if (Engine::get().isFull()) {

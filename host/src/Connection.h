@@ -27,6 +27,7 @@ class Listener : public Endpoint {
 
   private:
     const sp<BHwBinder> mTarget;
+    std::atomic<bool> mRefused = false;
 };
 
 /**

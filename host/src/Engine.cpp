@@ -19,6 +19,7 @@ namespace {
 
 // Edge-triggered: a connection costs no call to re-arm it, and wakes one thread, not all.
 constexpr uint32_t kEvents = EPOLLIN | EPOLLRDHUP | EPOLLET;
+constexpr int kRetryMilliseconds = 100;
 
 size_t halfOfDescriptorLimit() {
     rlimit limit = {};
@@ -113,6 +114,27 @@ void Engine::rearm(const Endpoint& endpoint) {
     epoll_ctl(mEpoll.get(), EPOLL_CTL_MOD, endpoint.socket(), &event);
 }
 
+void Engine::retry(uint64_t id) {
+    std::lock_guard<std::mutex> lock(mMutex);
+    mToRetry.insert(id);
+}
+
+int Engine::retryDelay() {
+    std::lock_guard<std::mutex> lock(mMutex);
+    return mToRetry.empty() ? -1 : kRetryMilliseconds;
+}
+
+void Engine::retryAll() {
+    std::set<uint64_t> ids;
+    {
+        std::lock_guard<std::mutex> lock(mMutex);
+        ids.swap(mToRetry);
+    }
+    for (const uint64_t id : ids) {
+        if (std::shared_ptr<Endpoint> endpoint = find(id)) endpoint->onReady();
+    }
+}
+
 bool Engine::isFull() {
     std::lock_guard<std::mutex> lock(mMutex);
     return mEndpoints.size() >= mMaxEndpoints;
@@ -122,7 +144,9 @@ bool Engine::isFull() {
 void Engine::serve() noexcept {
     for (;;) {
         epoll_event event;
-        if (epoll_wait(mEpoll.get(), &event, 1, -1) != 1) continue;
+        const int ready = epoll_wait(mEpoll.get(), &event, 1, retryDelay());
+        if (ready == 0) retryAll();
+        if (ready != 1) continue;
         if (std::shared_ptr<Endpoint> endpoint = find(event.data.u64)) endpoint->onReady();
     }
 }

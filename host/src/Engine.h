@@ -10,6 +10,7 @@
 #include <cstdint>
 #include <memory>
 #include <mutex>
+#include <set>
 #include <unordered_map>
 
 namespace android::hardware::host {
@@ -61,6 +62,8 @@ class Engine {
     void retire(uint64_t id);
     /** Has onReady() called again if there is still something to read. */
     void rearm(const Endpoint& endpoint);
+    /** Has onReady() called again in a moment, for what cannot be done just now. */
+    void retry(uint64_t id);
     /** Whether one more connection would leave the process too few descriptors for its own work. */
     bool isFull();
 
@@ -69,6 +72,8 @@ class Engine {
     std::shared_ptr<Endpoint> find(uint64_t id);
     void spawn(size_t threads);
     [[noreturn]] void serve() noexcept;
+    int retryDelay();
+    void retryAll();
 
     const base::unique_fd mEpoll;
     const size_t mMaxEndpoints;
@@ -80,6 +85,7 @@ class Engine {
     bool mCallerWillJoin = false;
     uint64_t mNextId = 1;
     std::unordered_map<uint64_t, std::shared_ptr<Endpoint>> mEndpoints;
+    std::set<uint64_t> mToRetry;
 };
 
 } // namespace android::hardware::host
