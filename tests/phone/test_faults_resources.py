@@ -97,13 +97,13 @@ def test_no_memory_left(phone):
     """Output that does not fit ends the service, as the runtime ends it for any exception that leaves
     a method; started again, it serves."""
     flood = phone.folder / "flood"
-    flood.write_bytes(b"7" * (32 << 20))
+    flood.write_bytes(b"7" * (16 << 20))
     stage(phone, "cat", "print", flood)
     status = pathlib.Path(f"/proc/{service_process(phone)}/status").read_text()
     size = int(re.search(r"VmSize:\s+(\d+)", status)[1]) << 10
     left_behind = processes(phone)
     with phone.start("getWlanMode") as client:
-        resource.prlimit(service_process(phone), resource.RLIMIT_AS, (size + (8 << 20),) * 2)
+        resource.prlimit(service_process(phone), resource.RLIMIT_AS, (size + (4 << 20),) * 2)
         assert outcome(client) == BROKEN
     wait_for(lambda: not any(pathlib.Path(f"/proc/{number}").exists() for number in left_behind))
     stage(phone, "cat", "clear")
