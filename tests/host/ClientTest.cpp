@@ -190,8 +190,8 @@ TEST_F(ClientTest, RecipientMayDropTheProxy) {
         }
     };
     sp<Dropper> dropper = new Dropper;
-    EXPECT_TRUE(service->linkToDeath(dropper, 0).withDefault(false));
     dropper->proxy = service;
+    EXPECT_TRUE(service->linkToDeath(dropper, 0).withDefault(false));
     service.clear();
     killServer();
     EXPECT_EQ(dropper->dropped.get_future().wait_for(std::chrono::seconds(20)),
