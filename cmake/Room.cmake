@@ -22,18 +22,19 @@ function(program name)
         add_executable(${name} ${PROGRAM_SOURCES})
     endif()
     target_compile_options(${name} PRIVATE ${ROOM_WARNINGS})
-    target_link_libraries(${name} PRIVATE ${PROGRAM_DEPENDS})
+    target_link_libraries(${name} PRIVATE ${PROGRAM_DEPENDS} ${EVERY_PROGRAM_DEPENDS})
 endfunction()
 
 # unit_test(<name> [STANDALONE] SOURCES <files>... DEPENDS <targets>...): a GoogleTest program, each
 # test known to CTest by itself.
 function(unit_test name)
     program(${name} ${ARGN})
+    math(EXPR timeout "60 * ${TIMEOUT_FACTOR}")
     target_link_libraries(${name} PRIVATE GTest::gmock_main)
     get_target_property(type ${name} TYPE)
     if(type STREQUAL EXECUTABLE)
         gtest_discover_tests(
-            ${name} TEST_PREFIX ${name}. DISCOVERY_MODE PRE_TEST PROPERTIES TIMEOUT 60
+            ${name} TEST_PREFIX ${name}. DISCOVERY_MODE PRE_TEST PROPERTIES TIMEOUT ${timeout}
         )
     endif()
 endfunction()
@@ -48,6 +49,7 @@ function(process_test name)
     if(NOT TEST_TIMEOUT)
         set(TEST_TIMEOUT 900)
     endif()
+    math(EXPR TEST_TIMEOUT "${TEST_TIMEOUT} * ${TIMEOUT_FACTOR}")
     list(TRANSFORM TEST_UNPARSED_ARGUMENTS PREPEND ${CMAKE_CURRENT_SOURCE_DIR}/)
     add_test(NAME ${name} COMMAND /usr/bin/python3 -B -m pytest -q -p no:cacheprovider
                                   ${TEST_UNPARSED_ARGUMENTS}

@@ -48,6 +48,7 @@ def service(phone):
         assert process.stdout.readline() == b"ready\n"
         yield process
         process.kill()
+        assert process.wait() in (0, -9)
 
 
 def run(*arguments, **options):

@@ -129,6 +129,8 @@ def test_a_soak_until_ctrl_c(phones):
     (["fuzz", "tools", "soon"], "dev: 'soon' is no number of seconds"),
     (["fuzz", "tools", "0"], "dev: '0' is no number of seconds"),
     (["fuzz", "tools", "1", "2"], "dev: fuzz takes a target and"),
+    (["test", "--sanitize", "memory"], "dev: --sanitize takes address or thread"),
+    (["test", "--sanitize"], "dev: --sanitize takes address or thread"),
     (["start"], "dev: there is no command 'start': see ./dev help"),
 ])
 def test_wrong_usage_is_one_line(dev, arguments, message):

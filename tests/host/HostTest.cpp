@@ -17,6 +17,8 @@ namespace vendor::korvan::bex::wifi::tests {
 namespace {
 
 constexpr int kPatienceMs = 20'000;
+// The exit code of tests/sanitizers.
+constexpr int kSanitizerReport = 66;
 
 void makePipe(android::base::unique_fd* readEnd, android::base::unique_fd* writeEnd) {
     int ends[2];
@@ -94,6 +96,7 @@ int ServerProcess::end() {
     int status = 0;
     EXPECT_EQ(waitpid(mPid, &status, 0), mPid);
     mEnded = true;
+    EXPECT_FALSE(WIFEXITED(status) && WEXITSTATUS(status) == kSanitizerReport);
     return WIFSIGNALED(status) ? WTERMSIG(status) : 0;
 }
 
