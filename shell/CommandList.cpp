@@ -16,9 +16,7 @@ bool mayFail(const std::string& line) {
 } // namespace
 
 std::string tokenLine(const Tokens& tokens) {
-    std::string line;
-    for (const std::string& token : tokens) line += token + ' ';
-    return line;
+    return lineOfWords(tokens.begin(), tokens.end());
 }
 
 int runList(const char* method, const char* tag, const CommandList& list, const LineRunner& run,

@@ -3,21 +3,25 @@
 
 #pragma once
 
+#include <initializer_list>
 #include <string>
-#include <vector>
+#include <string_view>
 
 #include "shell/CommandTable.h"
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 /**
- * One command of a list: any number of tokens. Unlike a Row it owns its words, and an empty one
- * does not end it: it leaves its blank in the line.
+ * One command of a list: any number of tokens. Unlike in a Row an empty one does not end it: it
+ * leaves its blank in the line. Like a Row it does not own its words.
  */
-using Tokens = std::vector<std::string>;
+using Tokens = std::initializer_list<std::string_view>;
 
-/** The commands of one operation, in the order in which they run. */
-using CommandList = std::vector<Tokens>;
+/**
+ * Commands in the order in which they run. Written where it is used, as in runList(..., {{"rmmod",
+ * "wlan.ko"}, {"insmod", path}}, ...): it ends with the expression that it stands in.
+ */
+using CommandList = std::initializer_list<Tokens>;
 
 /** The command line of a token list: each token followed by one blank, empty ones too. */
 std::string tokenLine(const Tokens& tokens);

@@ -3,16 +3,12 @@
 
 #include "shell/CommandTable.h"
 
+#include <algorithm>
+
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 std::string commandLine(const Row& row) {
-    std::string line;
-    for (std::string_view word : row) {
-        if (word.empty()) break;
-        line += word;
-        line += ' ';
-    }
-    return line;
+    return lineOfWords(row.begin(), std::find(row.begin(), row.end(), std::string_view()));
 }
 
 int runTable(const Table& table, const LineRunner& run, CommandResult& result) {

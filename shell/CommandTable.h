@@ -5,9 +5,9 @@
 
 #include <array>
 #include <functional>
+#include <initializer_list>
 #include <string>
 #include <string_view>
-#include <vector>
 
 #include "shell/Command.h"
 
@@ -22,8 +22,22 @@ namespace vendor::korvan::bex::wifi::V1_0::implementation {
  */
 using Row = std::array<std::string_view, 25>;
 
-/** The commands of one operation, in the order in which they run. */
-using Table = std::vector<Row>;
+/**
+ * Commands in the order in which they run. Written where it is used, as in the example below: it
+ * ends with the expression that it stands in, which spares the rows a way through the heap.
+ */
+using Table = std::initializer_list<Row>;
+
+/** A command line of words: each followed by one blank, the last one too. */
+template <typename Iterator>
+std::string lineOfWords(Iterator first, Iterator last) {
+    size_t length = 0;
+    for (Iterator word = first; word != last; ++word) length += word->size() + 1;
+    std::string line(length, ' ');
+    char* end = line.data();
+    for (Iterator word = first; word != last; ++word) end += word->copy(end, word->size()) + 1;
+    return line;
+}
 
 /** The command line of a row: each word followed by one blank, the last one too. */
 std::string commandLine(const Row& row);

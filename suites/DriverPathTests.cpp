@@ -70,20 +70,20 @@ int DriverPathTests::RunTxStStart(const std::string& channel, const std::string&
 }
 
 int DriverPathTests::RunTxStop(const std::string& channel) {
-    CommandList list = reload("insmod", "");
-    list.insert(list.begin(), {"myftm", "-J", "-I", bandFlag(channel), "-t 0"});
-    return run("RunTxStop", list);
+    const int ended = run("RunTxStop", {{"myftm", "-J", "-I", bandFlag(channel), "-t 0"}});
+    const int reloaded = reload("RunTxStop", "insmod", "");
+    return ended == 0 && reloaded == 0 ? 0 : -1;
 }
 
 int DriverPathTests::RunRxApJoinHoc(const std::string& ssid, const std::string& address) {
-    CommandList list = enterTestMode();
-    list.insert(list.end(), {
+    const int entered = enterTestMode("RunRxApJoinHoc");
+    const int joined = run("RunRxApJoinHoc", {
         {"iwlist", "wlan0", "scan"},
         {"iwconfig", "wlan0", "essid", ssid},
         {"ifconfig", "wlan0", address, "up"},
         {"ping", "-c", "4", "192.168.1.1"},
     });
-    return run("RunRxApJoinHoc", list);
+    return entered == 0 && joined == 0 ? 0 : -1;
 }
 
 int DriverPathTests::RunRxBgStart(const std::string& channel, const std::string& rate,
@@ -113,11 +113,11 @@ int DriverPathTests::RunRxAxStart(const std::string& channel, const std::string&
 
 int DriverPathTests::RunRxStop(const std::string& channel, std::string& out) {
     VendorTestSuit::CmdRunResult statistics;
-    const CommandList end = {{"myftm", "-J", "-I", bandFlag(channel), mChip.endRx}};
-    const int ended = run("RunRxStop", end, statistics);
+    const int ended = run("RunRxStop", {{"myftm", "-J", "-I", bandFlag(channel), mChip.endRx}},
+                          statistics);
     out = receivedText(mSuit, mTag, kCountField, statistics.output);
     // With its folder in front, insmod has to succeed.
-    const int reloaded = run("RunRxStop", reload("/vendor/bin/insmod", ""));
+    const int reloaded = reload("RunRxStop", "/vendor/bin/insmod", "");
     return ended == 0 && reloaded == 0 ? 0 : -1;
 }
 
@@ -131,27 +131,27 @@ const char* DriverPathTests::bandFlag(const std::string& channel) const {
     return is5GHz(channel) ? mChip.in5GHz : mChip.in24GHz;
 }
 
-CommandList DriverPathTests::reload(const char* insmod, const std::string& parameter) const {
-    CommandList list = {{"rmmod", "wlan.ko"}};
+int DriverPathTests::reload(const char* method, std::string_view insmod,
+                            std::string_view parameter) {
+    int status = run(method, {{"rmmod", "wlan.ko"}});
     for (const std::string& path : mDriverPaths) {
-        list.push_back({insmod, path});
-        if (!parameter.empty()) list.back().push_back(parameter);
+        const int loaded = parameter.empty() ? run(method, {{insmod, path}})
+                                             : run(method, {{insmod, path, parameter}});
+        if (loaded != 0) status = -1;
     }
-    return list;
+    return status;
 }
 
-CommandList DriverPathTests::enterTestMode() const {
-    CommandList list = reload("insmod", "con_mode=5");
-    list.push_back({"sleep 1.5"});
-    list.push_back({"ifconfig", "wlan0", "up"});
-    return list;
+int DriverPathTests::enterTestMode(const char* method) {
+    const int reloaded = reload(method, "insmod", "con_mode=5");
+    const int up = run(method, {{"sleep 1.5"}, {"ifconfig", "wlan0", "up"}});
+    return reloaded == 0 && up == 0 ? 0 : -1;
 }
 
 int DriverPathTests::start(const char* method, const Tokens& test) {
-    CommandList list = enterTestMode();
-    list.push_back({"myftm", "-J", mChip.radios});
-    list.push_back(test);
-    return run(method, list);
+    const int entered = enterTestMode(method);
+    const int started = run(method, {{"myftm", "-J", mChip.radios}, test});
+    return entered == 0 && started == 0 ? 0 : -1;
 }
 
 int DriverPathTests::startReception(const char* method, const Tokens& test, std::string& out) {

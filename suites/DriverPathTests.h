@@ -4,6 +4,7 @@
 #pragma once
 
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "shell/CommandList.h"
@@ -76,10 +77,10 @@ class DriverPathTests {
     const char* bandFlag(const std::string& channel) const;
 
     /** Unloads the driver and loads its modules, with a parameter unless that is empty. */
-    CommandList reload(const char* insmod, const std::string& parameter) const;
+    int reload(const char* method, std::string_view insmod, std::string_view parameter);
 
     /** Reloads the driver in factory test mode and brings the interface up. */
-    CommandList enterTestMode() const;
+    int enterTestMode(const char* method);
 
     /** Enters test mode and runs one myftm command. */
     int start(const char* method, const Tokens& test);

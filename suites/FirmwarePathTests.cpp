@@ -165,18 +165,21 @@ Row FirmwarePathTests::myftm(const Row& options) const {
 
 int FirmwarePathTests::run(std::string_view end, DriverLoad load, const Table& rows) {
     // rmmod knows the driver by this name whatever its file is called.
-    Table table = {
+    const int loaded = mSuit.runTable({
             myftm({end}),
             {mChip.tools.rmmod, "wlan.ko"},
             {mChip.tools.insmod, mFwPath, load == DriverLoad::TestMode ? "con_mode=5" : ""},
-    };
+    });
+    int switched = 0;
     if (load == DriverLoad::ThenTestMode) {
-        table.push_back({mChip.tools.sleep, "1"});
-        table.push_back({mChip.tools.ifconfig, "wlan0", "up"});
-        table.push_back({"echo", "5", ">", "/sys/module/wlan/parameters/con_mode"});
+        switched = mSuit.runTable({
+                {mChip.tools.sleep, "1"},
+                {mChip.tools.ifconfig, "wlan0", "up"},
+                {"echo", "5", ">", "/sys/module/wlan/parameters/con_mode"},
+        });
     }
-    table.insert(table.end(), rows.begin(), rows.end());
-    return mSuit.runTable(table);
+    const int ran = mSuit.runTable(rows);
+    return loaded == 0 && switched == 0 && ran == 0 ? 0 : -1;
 }
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

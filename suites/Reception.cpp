@@ -5,23 +5,13 @@
 
 #include <android/log.h>
 
+#include <algorithm>
 #include <stdexcept>
 #include <string_view>
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 namespace {
-
-/** The text up to the blank that ends a field, counted from 0; all of it without that blank. */
-std::string_view upToField(std::string_view text, size_t field) {
-    size_t end = 0;
-    for (size_t fields = 0; fields <= field; ++fields) {
-        end = text.find(' ', end);
-        if (end == std::string_view::npos) return text;
-        ++end;
-    }
-    return text.substr(0, end);
-}
 
 /** The same as rfind(), which looks at every place where this skips to the next first letter. */
 size_t findLast(std::string_view text, std::string_view word) {
@@ -31,6 +21,43 @@ size_t findLast(std::string_view text, std::string_view word) {
         last = pos;
     }
     return last;
+}
+
+/**
+ * From the last "goodPackets" on up to the end of a field, counted from 0, or of the text; empty
+ * without the label. The fields behind, of which there may be millions, are nobody's.
+ */
+template <typename Separates>
+std::string_view statistics(std::string_view output, const Separates& separates, size_t field) {
+    const size_t label = findLast(output, "goodPackets");
+    if (label == std::string_view::npos) return "";
+    const std::string_view text = output.substr(label);
+    const char* end = text.begin();
+    for (size_t fields = 0; fields <= field; ++fields) {
+        end = std::find_if(end, text.end(), separates);
+        if (end == text.end()) return text;
+        ++end;
+    }
+    return text.substr(0, static_cast<size_t>(end - text.begin()));
+}
+
+bool isBlank(char c) {
+    return c == ' ';
+}
+
+bool isBlankOrNewline(char c) {
+    return c == ' ' || c == '\n';
+}
+
+/** The field of what statistics() found, or all of that without the field. */
+std::string countIn(VendorTestSuit& suit, const char* tag, size_t field, std::string count) {
+    try {
+        count = suit.splitString(count, " ").at(field);
+    } catch (const std::out_of_range& missing) {
+        __android_log_print(ANDROID_LOG_ERROR, tag, "%s", missing.what());
+    }
+    __android_log_print(ANDROID_LOG_DEBUG, tag, "received packets: %s", count.c_str());
+    return count;
 }
 
 } // namespace
@@ -46,24 +73,13 @@ std::string countWithout(VendorTestSuit& suit, const std::string& label,
 
 std::string goodPackets(VendorTestSuit& suit, const char* tag, size_t field,
                         const std::string& output) {
-    std::string count;
-    const size_t label = findLast(output, "goodPackets");
-    // The fields behind, of which there may be millions, need no splitting.
-    if (label != std::string::npos) {
-        count = upToField(std::string_view(output).substr(label), field);
-    }
-    try {
-        count = suit.splitString(count, " ").at(field);
-    } catch (const std::out_of_range& missing) {
-        __android_log_print(ANDROID_LOG_ERROR, tag, "%s", missing.what());
-    }
-    __android_log_print(ANDROID_LOG_DEBUG, tag, "received packets: %s", count.c_str());
-    return count;
+    return countIn(suit, tag, field, std::string(statistics(output, isBlank, field)));
 }
 
 std::string receivedText(VendorTestSuit& suit, const char* tag, size_t field,
                          const std::string& output) {
-    return "Rx: " + goodPackets(suit, tag, field, suit.replaceSubString(output, "\n", " "));
+    const std::string text(statistics(output, isBlankOrNewline, field));
+    return "Rx: " + countIn(suit, tag, field, suit.replaceSubString(text, "\n", " "));
 }
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

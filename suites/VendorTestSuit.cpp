@@ -90,6 +90,7 @@ std::string VendorTestSuit::replaceSubString(const std::string& src, const std::
 std::vector<std::string> VendorTestSuit::splitString(const std::string& str,
                                                      const std::string& sep) {
     std::vector<std::string> pieces;
+    pieces.reserve(4); // what a packet count is picked from
     size_t start = 0;
     for (size_t pos = str.find(sep); pos != std::string::npos; pos = str.find(sep, start)) {
         pieces.push_back(str.substr(start, pos - start));
