@@ -33,15 +33,15 @@ bool endsWith(const std::string& text, const std::string& end) {
  */
 std::string replaceInOnePass(const std::string& src, const std::string& from,
                              const std::string& to) {
+    size_t found = src.find(from);
+    if (found == std::string::npos) return src;
     const std::string backwards(to.rbegin(), to.rend());
     std::string done;  // has been read, and holds no occurrence
     std::string again; // replacements that are to be read, backwards
     size_t next = 0;   // what is to be read of `src` behind them
     size_t origin = 0; // from here to `next`, `src` stands at the end of `done`
     done.reserve(src.size());
-    for (;;) {
-        const size_t found = src.find(from, origin);
-        if (found == std::string::npos) return done.append(src, next);
+    for (; found != std::string::npos; found = src.find(from, origin)) {
         if (found < next) {
             done.resize(done.size() - (next - found));
         } else {
@@ -64,6 +64,7 @@ std::string replaceInOnePass(const std::string& src, const std::string& from,
             }
         }
     }
+    return done.append(src, next);
 }
 
 } // namespace
@@ -93,10 +94,10 @@ std::vector<std::string> VendorTestSuit::splitString(const std::string& str,
     pieces.reserve(4); // what a packet count is picked from
     size_t start = 0;
     for (size_t pos = str.find(sep); pos != std::string::npos; pos = str.find(sep, start)) {
-        pieces.push_back(str.substr(start, pos - start));
+        pieces.emplace_back(str, start, pos - start);
         start = pos + sep.size();
     }
-    if (start != str.size()) pieces.push_back(str.substr(start));
+    if (start != str.size()) pieces.emplace_back(str, start);
     return pieces;
 }
 
