@@ -5,19 +5,48 @@
 
 #include <poll.h>
 #include <sys/inotify.h>
+#include <unistd.h>
 
 #include <algorithm>
+#include <mutex>
 #include <string>
+#include <utility>
 
 #include "host/src/HostRoot.h"
 
 namespace android::hardware::host {
 
-RegistrationWatch::RegistrationWatch() : mNotices(inotify_init1(IN_CLOEXEC)) {
+namespace {
+
+// The kernel takes tens of milliseconds to close an inotify instance, so the process keeps the last
+// one that it was done with.
+std::mutex gMutex;
+base::unique_fd& spare() {
+    static auto& spare = *new base::unique_fd;
+    return spare;
+}
+
+} // namespace
+
+RegistrationWatch::RegistrationWatch() {
+    {
+        std::lock_guard<std::mutex> lock(gMutex);
+        mNotices = std::move(spare());
+    }
+    if (!mNotices.ok()) mNotices.reset(inotify_init1(IN_CLOEXEC | IN_NONBLOCK));
     // Until the first registration of all there is no folder: its making is news as well.
     for (const std::string& folder : {hostRoot() + "/dev/socket", socketFolder()}) {
         inotify_add_watch(mNotices.get(), folder.c_str(), IN_CREATE | IN_MOVED_TO);
     }
+    // Of a former use, or told anew by what the caller is about to see.
+    alignas(inotify_event) char old[4096];
+    while (read(mNotices.get(), old, sizeof(old)) > 0) {
+    }
+}
+
+RegistrationWatch::~RegistrationWatch() {
+    std::lock_guard<std::mutex> lock(gMutex);
+    if (!spare().ok()) spare() = std::move(mNotices);
 }
 
 bool RegistrationWatch::wait(std::chrono::milliseconds timeout) {

@@ -14,11 +14,14 @@ namespace android::hardware::host {
 class RegistrationWatch {
   public:
     RegistrationWatch();
+    ~RegistrationWatch();
+    RegistrationWatch(const RegistrationWatch&) = delete;
+    RegistrationWatch& operator=(const RegistrationWatch&) = delete;
     /** Returns after a registration, or when the time is over: true for the first. */
     bool wait(std::chrono::milliseconds timeout);
 
   private:
-    const base::unique_fd mNotices;
+    base::unique_fd mNotices;
 };
 
 } // namespace android::hardware::host
