@@ -13,6 +13,7 @@
 #include <future>
 #include <thread>
 
+#include "host/src/RegistrationWatch.h"
 #include "tests/host/HostTest.h"
 #include "tests/host/ScriptedService.h"
 
@@ -170,6 +171,20 @@ TEST_F(RegistryTest, WaiterWakesAtOnce) {
         waited += std::chrono::steady_clock::now() - registered;
     }
     EXPECT_LT(waited, std::chrono::seconds(8));
+}
+
+// Or a waiter would look again and again without a pause.
+TEST_F(RegistryTest, AWatchKnowsNothingOfAnEarlierOnesNews) {
+    using std::chrono::milliseconds;
+    {
+        ::android::hardware::host::RegistrationWatch watch;
+        write("dev/socket/news", "");
+        EXPECT_TRUE(watch.wait(milliseconds(20'000)));
+    }
+    ::android::hardware::host::RegistrationWatch watch;
+    EXPECT_FALSE(watch.wait(milliseconds(0)));
+    write("dev/socket/more", "");
+    EXPECT_TRUE(watch.wait(milliseconds(20'000)));
 }
 
 TEST_F(RegistryTest, OwnProcessGetsTheObjectItself) {
