@@ -9,11 +9,11 @@
 #include <unistd.h>
 #include <vendor/korvan/bex/wifi/1.0/IWifiService.h>
 
-#include <algorithm>
 #include <chrono>
 
 #include "benchmarks/PingPong.h"
 #include "benchmarks/ServiceTree.h"
+#include "benchmarks/Turns.h"
 
 namespace {
 
@@ -37,29 +37,13 @@ void haveService() {
     static const Child service = ServiceTree::startService();
 }
 
-/** Times every round trip by itself, for the median and the slowest of a hundred. */
-template <typename RoundTrip>
-void measureLatency(benchmark::State& state, const RoundTrip& roundTrip) {
-    std::vector<double> times;
-    for (auto _ : state) {
-        const Clock::time_point start = Clock::now();
-        roundTrip();
-        times.push_back(secondsSince(start));
-    }
-    std::sort(times.begin(), times.end());
-    state.counters["p50"] = times[times.size() / 2];
-    state.counters["p99"] = times[times.size() * 99 / 100];
-}
-
-void latencyFloor(benchmark::State& state) {
-    static const Echo echo;
-    measureLatency(state, [] { pingPong(echo.socket); });
-}
-
 void latency(benchmark::State& state) {
     haveService();
+    static const Echo echo;
     static const sp<IWifiService> service = IWifiService::getService();
-    measureLatency(state, [] { callOnce(service); });
+    // In blocks: each call finds the caches as its own kind left them.
+    measureByTurns(
+            state, 100, [] { pingPong(echo.socket); }, [] { callOnce(service); });
 }
 
 /** Client processes that wait for a word, make their calls and say that they have. */
@@ -110,8 +94,8 @@ class Crowd {
 };
 
 void measureThroughput(benchmark::State& state, Crowd& crowd) {
-    for (auto _ : state) state.SetIterationTime(crowd.run());
-    state.SetItemsProcessed(state.iterations() * Crowd::kCalls);
+    while (state.KeepRunning()) state.SetIterationTime(crowd.run());
+    state.SetItemsProcessed(state.iterations() * static_cast<int64_t>(Crowd::kCalls));
 }
 
 void throughputFloor(benchmark::State& state) {
@@ -130,8 +114,7 @@ void throughput(benchmark::State& state) {
     measureThroughput(state, crowd);
 }
 
-BENCHMARK(latencyFloor)->Name("latency/floor")->UseRealTime();
-BENCHMARK(latency)->Name("latency/service")->UseRealTime();
+BENCHMARK(latency)->Iterations(100);
 BENCHMARK(throughputFloor)->Name("clients/floor")->Arg(2)->Arg(64)->UseManualTime();
 BENCHMARK(throughput)->Name("clients/service")->Arg(2)->Arg(64)->UseManualTime();
 

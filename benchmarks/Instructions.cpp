@@ -54,7 +54,8 @@ void count(const std::string& name, const std::function<void()>& work) {
 
 } // namespace
 
-// The linker leads the service's calls of these functions here. The log is dropped.
+// The linker leads the service's calls of these functions here, under its own kind of names. The
+// log is dropped. NOLINTBEGIN(bugprone-reserved-identifier)
 extern "C" {
 
 FILE* __real_popen(const char* line, const char* mode);
@@ -81,6 +82,7 @@ int __wrap___android_log_print(int, const char*, const char*, ...) {
     return 0;
 }
 }
+// NOLINTEND(bugprone-reserved-identifier)
 
 namespace {
 

@@ -3,6 +3,8 @@
 
 #include "benchmarks/ServiceTree.h"
 
+#include <errno.h>
+#include <spawn.h>
 #include <stdlib.h>
 #include <unistd.h>
 
@@ -14,13 +16,15 @@ namespace vendor::korvan::bex::wifi::benchmarks {
 namespace {
 
 Child spawned(const char* program, int input) {
-    const pid_t pid = vfork();
-    require(pid >= 0, "vfork");
-    if (pid == 0) {
-        if (input >= 0) dup2(input, STDIN_FILENO);
-        execl(program, program, nullptr);
-        _exit(127);
-    }
+    posix_spawn_file_actions_t actions;
+    posix_spawn_file_actions_init(&actions);
+    if (input >= 0) posix_spawn_file_actions_adddup2(&actions, input, STDIN_FILENO);
+    std::string name = program;
+    char* const arguments[] = {name.data(), nullptr};
+    pid_t pid;
+    errno = posix_spawn(&pid, program, &actions, nullptr, arguments, environ);
+    require(errno == 0, "posix_spawn");
+    posix_spawn_file_actions_destroy(&actions);
     return Child(pid);
 }
 

@@ -14,12 +14,14 @@
 #include <string>
 
 #include "benchmarks/PingPong.h"
+#include "benchmarks/Turns.h"
 #include "suites/BrcmTestSuit.h"
 
 namespace {
 
 using namespace vendor::korvan::bex::wifi::V1_0::implementation;
 using vendor::korvan::bex::wifi::benchmarks::forked;
+using vendor::korvan::bex::wifi::benchmarks::measureByTurns;
 using vendor::korvan::bex::wifi::benchmarks::require;
 
 constexpr size_t kOutputSize = 100'000'000;
@@ -31,13 +33,15 @@ bool gQuiet = false;
 
 } // namespace
 
-// The linker leads all calls of popen in this program here.
+// The linker leads all calls of popen in this program here, under its own kind of names.
+// NOLINTBEGIN(bugprone-reserved-identifier)
 extern "C" {
 FILE* __real_popen(const char* line, const char* mode);
 FILE* __wrap_popen(const char* line, const char* mode) {
     return __real_popen(gQuiet ? ":" : line, mode);
 }
 }
+// NOLINTEND(bugprone-reserved-identifier)
 
 namespace {
 
@@ -61,8 +65,9 @@ std::string throughSuite(const char* line) {
 
 using Runner = std::string (*)(const char* line);
 
-void nothing(benchmark::State& state, Runner run) {
-    for (auto _ : state) run(":");
+void nothing(benchmark::State& state) {
+    measureByTurns(
+            state, 1, [] { bareLoop(":"); }, [] { throughSuite(":"); });
 }
 
 /** A file of lines, which cat prints faster than anybody reads. */
@@ -90,8 +95,8 @@ const std::string& printing() {
 }
 
 void output(benchmark::State& state, Runner run) {
-    const std::string line = printing();
-    for (auto _ : state) require(run(line.c_str()).size() >= kOutputSize, "the output");
+    const std::string& line = printing();
+    while (state.KeepRunning()) require(run(line.c_str()).size() >= kOutputSize, "the output");
 }
 
 /** The most memory that this process has had resident, in bytes. */
@@ -105,9 +110,9 @@ double peakMemory() {
 }
 
 void peak(benchmark::State& state) {
-    const std::string line = printing();
+    const std::string& line = printing();
     double grown = 0;
-    for (auto _ : state) {
+    while (state.KeepRunning()) {
         int ends[2];
         require(pipe2(ends, O_CLOEXEC) == 0, "pipe2");
         const auto child = forked([&] {
@@ -126,24 +131,19 @@ void peak(benchmark::State& state) {
 void operation(benchmark::State& state) {
     BrcmTestSuit suit;
     gQuiet = true;
-    for (auto _ : state) suit.RunTxNStart("36", "80", "7", "15", true, "1");
+    measureByTurns(
+            state, 1,
+            [] {
+                for (int i = 0; i < kLinesOfTxN; ++i) bareLoop("");
+            },
+            [&] { suit.RunTxNStart("36", "80", "7", "15", true, "1"); });
     gQuiet = false;
 }
 
-void operationFloor(benchmark::State& state) {
-    gQuiet = true;
-    for (auto _ : state) {
-        for (int i = 0; i < kLinesOfTxN; ++i) bareLoop("");
-    }
-    gQuiet = false;
-}
-
-BENCHMARK_CAPTURE(nothing, floor, bareLoop)->UseRealTime();
-BENCHMARK_CAPTURE(nothing, service, throughSuite)->UseRealTime();
+BENCHMARK(nothing)->Iterations(100);
+BENCHMARK(operation)->Iterations(5);
 BENCHMARK_CAPTURE(output, floor, bareLoop)->UseRealTime();
 BENCHMARK_CAPTURE(output, service, throughSuite)->UseRealTime();
-BENCHMARK(operationFloor)->Name("operation/floor")->UseRealTime();
-BENCHMARK(operation)->Name("operation/service")->UseRealTime();
 BENCHMARK(peak)->Iterations(1);
 
 } // namespace

@@ -38,7 +38,7 @@ double residentMemory(pid_t pid) {
 }
 
 void startFloor(benchmark::State& state) {
-    for (auto _ : state) {
+    while (state.KeepRunning()) {
         int ends[2];
         require(socketpair(AF_UNIX, SOCK_SEQPACKET | SOCK_CLOEXEC, 0, ends) == 0, "socketpair");
         const Clock::time_point start = Clock::now();
@@ -53,7 +53,7 @@ void startFloor(benchmark::State& state) {
 
 void start(benchmark::State& state) {
     static const ServiceTree tree;
-    for (auto _ : state) {
+    while (state.KeepRunning()) {
         const Clock::time_point start = Clock::now();
         const Child program = ServiceTree::startService();
         const sp<IWifiService> service = IWifiService::getService();

@@ -37,7 +37,7 @@ size_t megabytes(const benchmark::State& state) {
 
 void copyFloor(benchmark::State& state) {
     const std::string text = listing(megabytes(state));
-    for (auto _ : state) {
+    while (state.KeepRunning()) {
         std::string copy = text;
         benchmark::DoNotOptimize(copy.data());
     }
@@ -46,7 +46,7 @@ void copyFloor(benchmark::State& state) {
 void replaceNewlines(benchmark::State& state) {
     const std::string text = listing(megabytes(state));
     BrcmTestSuit suit;
-    for (auto _ : state) {
+    while (state.KeepRunning()) {
         std::string joined = suit.replaceSubString(text, "\n", "");
         benchmark::DoNotOptimize(joined.data());
     }
@@ -65,38 +65,49 @@ class AnsweredSuit : public Suit {
 
 enum class Label { AtStart, NearEnd };
 
+using StopReception = void (*)(std::string& printed, std::string& out);
+
 template <typename Suit>
-void packetCount(benchmark::State& state, const char* label, Label place) {
+void stopReception(std::string& printed, std::string& out) {
+    static AnsweredSuit<Suit> suit;
+    suit.mOutput = std::move(printed);
+    suit.RunRxStop("6", out);
+}
+
+void packets(benchmark::State& state, StopReception stop, const char* label, Label place) {
     const std::string line = std::string(label) + "48 badPackets 3\n";
     const std::string rest = listing(megabytes(state));
     const std::string text = place == Label::AtStart ? line + rest : rest + line + listing(100);
-    AnsweredSuit<Suit> suit;
     std::string out;
-    for (auto _ : state) {
+    while (state.KeepRunning()) {
         state.PauseTiming();
-        suit.mOutput = text;
+        std::string printed = text;
         out = std::string();
         state.ResumeTiming();
-        suit.RunRxStop("6", out);
+        stop(printed, out);
         benchmark::DoNotOptimize(out.data());
     }
     if (out.find("48") == std::string::npos) state.SkipWithError("no count");
 }
 
-template <typename... Args>
-void measure(const std::string& name, Args... args) {
-    benchmark::RegisterBenchmark(name.c_str(), args...)
-            ->Arg(1)
-            ->Arg(4)
-            ->Arg(16)
-            ->Unit(benchmark::kMillisecond);
-}
+// clang-format off
+// NOLINTBEGIN(bugprone-macro-parentheses): the suite is a type.
+#define BEX_SIZES ->Arg(1)->Arg(16)->Unit(benchmark::kMillisecond)
+#define BEX_PACKETS(name, suit, label)                                                       \
+    BENCHMARK_CAPTURE(packets, name/start, stopReception<suit>, label, Label::AtStart)     \
+    BEX_SIZES;                                                                               \
+    BENCHMARK_CAPTURE(packets, name/end, stopReception<suit>, label, Label::NearEnd) BEX_SIZES
 
-template <typename Suit>
-void measurePacketCount(const std::string& suit, const char* label) {
-    measure("packets/" + suit + "/start", packetCount<Suit>, label, Label::AtStart);
-    measure("packets/" + suit + "/end", packetCount<Suit>, label, Label::NearEnd);
-}
+BENCHMARK(copyFloor)->Name("copy") BEX_SIZES;
+BENCHMARK(replaceNewlines)->Name("replace") BEX_SIZES;
+BEX_PACKETS(broadcom, BrcmTestSuit, "pktengrxdmcast ");
+BEX_PACKETS(wcn, WcnTestSuit, "wlan0     get_rxpktcnt:");
+BEX_PACKETS(qca, QcaTestSuit, "goodPackets ");
+BEX_PACKETS(wcn39xx, Wcn39xxTestSuit, "goodPackets ");
+BEX_PACKETS(qca639x, Qca639xTestSuit, "goodPackets = ");
+BEX_PACKETS(wcn6750, Wcn6750TestSuit, "goodPackets = ");
+// NOLINTEND(bugprone-macro-parentheses)
+// clang-format on
 
 } // namespace
 
@@ -105,14 +116,6 @@ int main(int argc, char** argv) {
     // Every text in fresh memory, the floor's too, as in a service that reads such an output once.
     mallopt(M_MMAP_THRESHOLD, 128 * 1024);
     benchmark::Initialize(&argc, argv);
-    measure("copy", copyFloor);
-    measure("replace", replaceNewlines);
-    measurePacketCount<BrcmTestSuit>("broadcom", "pktengrxdmcast ");
-    measurePacketCount<WcnTestSuit>("wcn", "wlan0     get_rxpktcnt:");
-    measurePacketCount<QcaTestSuit>("qca", "goodPackets ");
-    measurePacketCount<Wcn39xxTestSuit>("wcn39xx", "goodPackets ");
-    measurePacketCount<Qca639xTestSuit>("qca639x", "goodPackets = ");
-    measurePacketCount<Wcn6750TestSuit>("wcn6750", "goodPackets = ");
     benchmark::RunSpecifiedBenchmarks();
     return 0;
 }
