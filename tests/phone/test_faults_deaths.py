@@ -108,7 +108,8 @@ def test_a_service_killed_in_each_call(phone):
 
 def test_a_service_that_dies_by_itself(phone):
     os.kill(service_process(phone), signal.SIGKILL)
-    wait_for(lambda: phone.call("getWlanMode")[0] == 3)  # until nobody listens any more
+    wait_for(lambda: not phone.is_up())
+    assert phone.call("getWlanMode")[0] == 3
     phone.up()
     assert phone.call("getWlanMode") == (0, b"0\n", b"")
 

@@ -98,14 +98,17 @@ def test_no_memory_left(phone):
     a method; started again, it serves."""
     flood = phone.folder / "flood"
     flood.write_bytes(b"7" * (16 << 20))
-    stage(phone, "cat", "print", flood)
+    stage(phone, "cat", "wait", "print", flood)
     status = pathlib.Path(f"/proc/{service_process(phone)}/status").read_text()
     size = int(re.search(r"VmSize:\s+(\d+)", status)[1]) << 10
     left_behind = processes(phone)
     with phone.start("getWlanMode") as client:
+        wait_for((phone.root / "phone/faults/cat.waiting").exists)  # the tool is not limited
         resource.prlimit(service_process(phone), resource.RLIMIT_AS, (size + (4 << 20),) * 2)
+        stage(phone, "cat", "release")
         assert outcome(client) == BROKEN
     wait_for(lambda: not any(pathlib.Path(f"/proc/{number}").exists() for number in left_behind))
+    wait_for(lambda: not phone.is_up())
     stage(phone, "cat", "clear")
     phone.up()
     assert result(phone, "getWlanMode") == WORKED
