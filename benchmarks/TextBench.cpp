@@ -113,8 +113,8 @@ BEX_PACKETS(wcn6750, Wcn6750TestSuit, "goodPackets = ");
 
 int main(int argc, char** argv) {
     __android_log_set_minimum_priority(ANDROID_LOG_SILENT);
-    // Every text in fresh memory, the floor's too, as in a service that reads such an output once. The
-    // phone's C library has no such threshold, and maps large texts afresh as it is.
+    // Every text in fresh memory, the floor's too, as in a service that reads such an output once.
+    // The phone's C library has no such threshold, and maps large texts afresh as it is.
 #ifdef M_MMAP_THRESHOLD
     mallopt(M_MMAP_THRESHOLD, 128 * 1024);
 #endif
