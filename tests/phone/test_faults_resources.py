@@ -21,6 +21,8 @@ CALL = ["RunTxBGStart", "6", "54", "15", "1"]
 FAILED = (1, b"-1\n", 1)
 WORKED = (0, b"0\n", 0)
 BROKEN = (4, b"", 1)
+# What the C library reserves at once for a thread's allocations: so much fits without asking for more.
+ARENA = 64 << 20
 
 
 def outcome(client):
@@ -97,14 +99,16 @@ def test_no_memory_left(phone):
     """Output that does not fit ends the service, as the runtime ends it for any exception that leaves
     a method; started again, it serves."""
     flood = phone.folder / "flood"
-    flood.write_bytes(b"7" * (16 << 20))
+    flood.write_bytes(b"7" * ARENA)
     stage(phone, "cat", "wait", "print", flood)
-    status = pathlib.Path(f"/proc/{service_process(phone)}/status").read_text()
-    size = int(re.search(r"VmSize:\s+(\d+)", status)[1]) << 10
     left_behind = processes(phone)
     with phone.start("getWlanMode") as client:
         wait_for((phone.root / "phone/faults/cat.waiting").exists)  # the tool is not limited
-        resource.prlimit(service_process(phone), resource.RLIMIT_AS, (size + (4 << 20),) * 2)
+        service = service_process(phone)
+        # By now the thread that serves the call has what address space it takes for itself.
+        status = pathlib.Path(f"/proc/{service}/status").read_text()
+        size = int(re.search(r"VmSize:\s+(\d+)", status)[1]) << 10
+        resource.prlimit(service, resource.RLIMIT_AS, (size + (4 << 20),) * 2)
         stage(phone, "cat", "release")
         assert outcome(client) == BROKEN
     wait_for(lambda: not any(pathlib.Path(f"/proc/{number}").exists() for number in left_behind))
