@@ -9,6 +9,7 @@
 #include <log/log.h>
 #include <sys/epoll.h>
 #include <sys/resource.h>
+#include <sys/timerfd.h>
 
 #include <cstring>
 #include <thread>
@@ -19,7 +20,9 @@ namespace {
 
 // Edge-triggered: a connection costs no call to re-arm it, and wakes one thread, not all.
 constexpr uint32_t kEvents = EPOLLIN | EPOLLRDHUP | EPOLLET;
-constexpr int kRetryMilliseconds = 100;
+constexpr itimerspec kRetryDelay = {.it_interval = {}, .it_value = {0, 100'000'000}};
+// What epoll tells of the timer; the endpoints' names begin above it.
+constexpr uint64_t kRetryTimer = 0;
 
 size_t halfOfDescriptorLimit() {
     rlimit limit = {};
@@ -35,8 +38,16 @@ Engine& Engine::get() {
     return engine;
 }
 
-Engine::Engine() : mEpoll(epoll_create1(EPOLL_CLOEXEC)), mMaxEndpoints(halfOfDescriptorLimit()) {
-    LOG_ALWAYS_FATAL_IF(!mEpoll.ok(), "epoll_create1: %s", strerror(errno));
+Engine::Engine()
+      : mEpoll(epoll_create1(EPOLL_CLOEXEC)),
+        mRetryTimer(timerfd_create(CLOCK_MONOTONIC, TFD_CLOEXEC)),
+        mMaxEndpoints(halfOfDescriptorLimit()) {
+    epoll_event event = {};
+    event.events = kEvents;
+    event.data.u64 = kRetryTimer;
+    const bool made = mRetryTimer.ok() && mEpoll.ok() &&
+                      epoll_ctl(mEpoll.get(), EPOLL_CTL_ADD, mRetryTimer.get(), &event) == 0;
+    LOG_ALWAYS_FATAL_IF(!made, "Cannot make the server: %s", strerror(errno));
 }
 
 void Engine::configure(size_t threads, bool callerWillJoin) {
@@ -116,12 +127,8 @@ void Engine::rearm(const Endpoint& endpoint) {
 
 void Engine::retry(uint64_t id) {
     std::lock_guard<std::mutex> lock(mMutex);
+    if (mToRetry.empty()) timerfd_settime(mRetryTimer.get(), 0, &kRetryDelay, nullptr);
     mToRetry.insert(id);
-}
-
-int Engine::retryDelay() {
-    std::lock_guard<std::mutex> lock(mMutex);
-    return mToRetry.empty() ? -1 : kRetryMilliseconds;
 }
 
 void Engine::retryAll() {
@@ -144,10 +151,12 @@ bool Engine::isFull() {
 void Engine::serve() noexcept {
     for (;;) {
         epoll_event event;
-        const int ready = epoll_wait(mEpoll.get(), &event, 1, retryDelay());
-        if (ready == 0) retryAll();
-        if (ready != 1) continue;
-        if (std::shared_ptr<Endpoint> endpoint = find(event.data.u64)) endpoint->onReady();
+        if (epoll_wait(mEpoll.get(), &event, 1, -1) != 1) continue;
+        if (event.data.u64 == kRetryTimer) {
+            retryAll();
+        } else if (std::shared_ptr<Endpoint> endpoint = find(event.data.u64)) {
+            endpoint->onReady();
+        }
     }
 }
 

@@ -72,10 +72,11 @@ class Engine {
     std::shared_ptr<Endpoint> find(uint64_t id);
     void spawn(size_t threads);
     [[noreturn]] void serve() noexcept;
-    int retryDelay();
     void retryAll();
 
     const base::unique_fd mEpoll;
+    // In the epoll instance too: at the moment of need there may be no descriptor for it.
+    const base::unique_fd mRetryTimer;
     const size_t mMaxEndpoints;
 
     std::mutex mMutex;

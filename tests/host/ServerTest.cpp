@@ -5,8 +5,11 @@
 
 #include <hidl/HidlTransportSupport.h>
 #include <hwbinder/Parcel.h>
+#include <poll.h>
 #include <signal.h>
+#include <sys/resource.h>
 
+#include <chrono>
 #include <cstdio>
 #include <future>
 #include <thread>
@@ -20,10 +23,37 @@ namespace vendor::korvan::bex::wifi::tests {
 namespace {
 
 using ::android::OK;
+using ::android::hardware::host::FrameHeader;
+using ::android::hardware::host::Session;
 
 const std::string kDead = transportFailure("DEAD_OBJECT");
 
 class ServerTest : public ServedTest {};
+
+/** A call from a client of its own: it has certainly come when this returns. */
+std::unique_ptr<Session> startCall(const char* script) {
+    auto session =
+            Session::open(android::hardware::host::socketPath(IWifiService::descriptor, "default"));
+    EXPECT_NE(session, nullptr);
+    android::hardware::Parcel data;
+    android::hardware::hidl_string text = script;
+    size_t parent;
+    EXPECT_EQ(data.writeInterfaceToken(IWifiService::descriptor), OK);
+    EXPECT_EQ(data.writeBuffer(&text, sizeof(text), &parent), OK);
+    EXPECT_EQ(writeEmbeddedToParcel(text, &data, parent, 0), OK);
+    FrameHeader header;
+    header.code = 16;
+    EXPECT_EQ(sendFrame(session->first(), header, &data, 0), OK);
+    return session;
+}
+
+void expectAnswer(const Session& session) {
+    FrameHeader header;
+    android::hardware::Parcel reply;
+    EXPECT_EQ(android::hardware::host::FrameReader(session.first()).receive(0, &header, &reply),
+              android::hardware::host::Receipt::kFrame);
+    EXPECT_EQ(header.status, OK);
+}
 
 struct Misbehaviour {
     const char* script;
@@ -67,19 +97,7 @@ TEST_F(ServerTest, ThirdCallWaitsForAThread) {
     auto second = std::async(std::launch::async, [&] { return call(service, "wait"); });
     ASSERT_EQ(server->report(), "entered");
 
-    // By hand, so that the third call has certainly arrived when the gate opens.
-    auto third = android::hardware::host::Session::open(
-            android::hardware::host::socketPath(IWifiService::descriptor, "default"));
-    ASSERT_NE(third, nullptr);
-    android::hardware::Parcel data;
-    android::hardware::hidl_string script = "wait";
-    size_t parent;
-    ASSERT_EQ(data.writeInterfaceToken(IWifiService::descriptor), OK);
-    ASSERT_EQ(data.writeBuffer(&script, sizeof(script), &parent), OK);
-    ASSERT_EQ(writeEmbeddedToParcel(script, &data, parent, 0), OK);
-    android::hardware::host::FrameHeader header;
-    header.code = 16;
-    ASSERT_EQ(sendFrame(third->first(), header, &data, 0), OK);
+    auto third = startCall("wait");
 
     server->openGate();
     EXPECT_EQ(server->report(), "leaving");
@@ -90,10 +108,7 @@ TEST_F(ServerTest, ThirdCallWaitsForAThread) {
     EXPECT_EQ(server->report(), "leaving");
     EXPECT_EQ(first.get(), "done");
     EXPECT_EQ(second.get(), "done");
-    android::hardware::Parcel reply;
-    EXPECT_EQ(android::hardware::host::FrameReader(third->first()).receive(0, &header, &reply),
-              android::hardware::host::Receipt::kFrame);
-    EXPECT_EQ(header.status, OK);
+    expectAnswer(*third);
 }
 
 // Calls that all wait at once, from more clients than threads.
@@ -111,6 +126,32 @@ TEST_F(ServerTest, ManyClientsAreAllServed) {
     }
     for (std::thread& client : clients) client.join();
     EXPECT_EQ(failures, 0);
+}
+
+// A client for whom there was no descriptor need not wait until the others are silent.
+TEST_F(HostTest, ARefusedClientIsServedBesideABusyOne) {
+    ServerProcess server({"pool", "1", "register", "default", "ready", "join"});
+    ASSERT_EQ(server.report(), "0");
+    ASSERT_EQ(server.report(), "ready");
+    sp<IWifiService> busy = IWifiService::tryGetService();
+    ASSERT_NE(busy, nullptr);
+    EXPECT_EQ(call(busy, "warm"), "warm");
+
+    rlimit usual = {};
+    ASSERT_EQ(prlimit(server.pid(), RLIMIT_NOFILE, nullptr, &usual), 0);
+    const rlimit none = {0, usual.rlim_max};
+    ASSERT_EQ(prlimit(server.pid(), RLIMIT_NOFILE, &none, nullptr), 0);
+    auto refused = startCall("here");
+    EXPECT_EQ(call(busy, "after it"), "after it");
+    ASSERT_EQ(prlimit(server.pid(), RLIMIT_NOFILE, &usual, nullptr), 0);
+
+    pollfd answer = {refused->first(), POLLIN, 0};
+    const auto patience = std::chrono::steady_clock::now() + std::chrono::seconds(20);
+    while (poll(&answer, 1, 0) == 0 && std::chrono::steady_clock::now() < patience) {
+        EXPECT_EQ(call(busy, "again"), "again");
+    }
+    ASSERT_NE(answer.revents, 0);
+    expectAnswer(*refused);
 }
 
 TEST_F(ServerTest, ThreadsShareOneProxy) {
@@ -174,7 +215,7 @@ TEST_F(HostTest, UnconfiguredProcessServesWithOneThread) {
 TEST_F(ServerTest, EveryDescriptorClosesOnExec) {
     EXPECT_EQ(call(service, "warm"), "warm");
     FILE* list = popen(("cd /proc/" + std::to_string(server->pid()) +
-                        "/fdinfo && for fd in *; do test $fd -gt 4 && grep flags $fd; done")
+                        "/fdinfo && for fd in *; do test $fd -gt 4 && grep ^flags $fd; done")
                                .c_str(),
                        "r");
     ASSERT_NE(list, nullptr);
@@ -185,7 +226,7 @@ TEST_F(ServerTest, EveryDescriptorClosesOnExec) {
         ++seen;
     }
     pclose(list);
-    EXPECT_GE(seen, 3); // the listener, the connection, the epoll instance
+    EXPECT_GE(seen, 4); // the listener, the connection, the epoll instance, its timer
 }
 
 } // namespace
