@@ -9,8 +9,7 @@
 #include <unistd.h>
 #include <vendor/korvan/bex/wifi/1.0/IWifiService.h>
 
-#include <chrono>
-
+#include "benchmarks/Clock.h"
 #include "benchmarks/PingPong.h"
 #include "benchmarks/ServiceTree.h"
 #include "benchmarks/Turns.h"
@@ -20,11 +19,6 @@ namespace {
 using namespace vendor::korvan::bex::wifi::benchmarks;
 using ::android::sp;
 using ::vendor::korvan::bex::wifi::V1_0::IWifiService;
-using Clock = std::chrono::steady_clock;
-
-double secondsSince(Clock::time_point start) {
-    return std::chrono::duration<double>(Clock::now() - start).count();
-}
 
 void callOnce(const sp<IWifiService>& service) {
     const bool answer = service->isMimoSupport();

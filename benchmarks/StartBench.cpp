@@ -9,10 +9,10 @@
 #include <unistd.h>
 #include <vendor/korvan/bex/wifi/1.0/IWifiService.h>
 
-#include <chrono>
 #include <fstream>
 #include <string>
 
+#include "benchmarks/Clock.h"
 #include "benchmarks/PingPong.h"
 #include "benchmarks/ServiceTree.h"
 
@@ -21,11 +21,6 @@ namespace {
 using namespace vendor::korvan::bex::wifi::benchmarks;
 using ::android::sp;
 using ::vendor::korvan::bex::wifi::V1_0::IWifiService;
-using Clock = std::chrono::steady_clock;
-
-double secondsSince(Clock::time_point start) {
-    return std::chrono::duration<double>(Clock::now() - start).count();
-}
 
 /** What a process has resident, in bytes. */
 double residentMemory(pid_t pid) {

@@ -6,8 +6,9 @@
 #include <benchmark/benchmark.h>
 
 #include <algorithm>
-#include <chrono>
 #include <vector>
+
+#include "benchmarks/Clock.h"
 
 namespace vendor::korvan::bex::wifi::benchmarks {
 
@@ -16,10 +17,9 @@ class Durations {
   public:
     template <typename Work>
     void add(const Work& work) {
-        const auto start = std::chrono::steady_clock::now();
+        const Clock::time_point start = Clock::now();
         work();
-        const std::chrono::duration<double> taken = std::chrono::steady_clock::now() - start;
-        mSeconds.push_back(taken.count());
+        mSeconds.push_back(secondsSince(start));
     }
 
     /** The one that so many hundredths are not longer than. */

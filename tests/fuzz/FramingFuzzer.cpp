@@ -25,6 +25,7 @@
 #include "host/src/TransactionBuffer.h"
 #include "recorder/RecordedShell.h"
 #include "service/WifiService.h"
+#include "tests/Message.h"
 #include "tests/fuzz/Check.h"
 #include "tests/fuzz/Frames.h"
 #include "tests/fuzz/Input.h"
@@ -73,21 +74,7 @@ Ends makeEnds() {
 
 /** Sends one message; one that the socket has no room for is dropped. */
 void sendMessage(int socket, const Bytes& bytes, const std::vector<int>& descriptors = {}) {
-    iovec part = {const_cast<uint8_t*>(bytes.data()), bytes.size()};
-    msghdr head = {};
-    head.msg_iov = &part;
-    head.msg_iovlen = 1;
-    alignas(cmsghdr) char control[CMSG_SPACE(sizeof(int) * 2)] = {};
-    if (!descriptors.empty()) {
-        head.msg_control = control;
-        head.msg_controllen = CMSG_SPACE(sizeof(int) * descriptors.size());
-        cmsghdr* message = CMSG_FIRSTHDR(&head);
-        message->cmsg_level = SOL_SOCKET;
-        message->cmsg_type = SCM_RIGHTS;
-        message->cmsg_len = CMSG_LEN(sizeof(int) * descriptors.size());
-        memcpy(CMSG_DATA(message), descriptors.data(), sizeof(int) * descriptors.size());
-    }
-    sendmsg(socket, &head, MSG_NOSIGNAL | MSG_DONTWAIT);
+    vendor::korvan::bex::wifi::tests::sendMessage(socket, bytes, descriptors, MSG_DONTWAIT);
 }
 
 unique_fd memoryWith(const Bytes& bytes) {

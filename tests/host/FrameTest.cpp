@@ -19,6 +19,7 @@
 #include "host/src/ReceivedBuffer.h"
 #include "host/src/Session.h"
 #include "host/src/SocketFile.h"
+#include "tests/Message.h"
 #include "tests/host/HostTest.h"
 
 namespace vendor::korvan::bex::wifi::tests {
@@ -32,13 +33,6 @@ using host::ParcelAccess;
 using host::Receipt;
 
 using Bytes = std::vector<uint8_t>;
-
-void fillCall(Parcel* parcel, const hidl_string& text) {
-    size_t parent;
-    ASSERT_EQ(parcel->writeInterfaceToken(IWifiService::descriptor), OK);
-    ASSERT_EQ(parcel->writeBuffer(&text, sizeof(text), &parent), OK);
-    ASSERT_EQ(writeEmbeddedToParcel(text, parcel, parent, 0), OK);
-}
 
 /** RunRxStop(text) as it goes over the wire. */
 Bytes validFrame(const hidl_string& text) {
@@ -73,22 +67,8 @@ class FrameTest : public ServedTest {
         return peer;
     }
 
-    void sendBytes(int peer, const Bytes& bytes, std::vector<int> descriptors = {}) {
-        iovec part = {const_cast<uint8_t*>(bytes.data()), bytes.size()};
-        msghdr head = {};
-        head.msg_iov = &part;
-        head.msg_iovlen = 1;
-        alignas(cmsghdr) char control[CMSG_SPACE(sizeof(int) * 8)] = {};
-        if (!descriptors.empty()) {
-            head.msg_control = control;
-            head.msg_controllen = CMSG_SPACE(sizeof(int) * descriptors.size());
-            cmsghdr* message = CMSG_FIRSTHDR(&head);
-            message->cmsg_level = SOL_SOCKET;
-            message->cmsg_type = SCM_RIGHTS;
-            message->cmsg_len = CMSG_LEN(sizeof(int) * descriptors.size());
-            memcpy(CMSG_DATA(message), descriptors.data(), sizeof(int) * descriptors.size());
-        }
-        ASSERT_EQ(sendmsg(peer, &head, MSG_NOSIGNAL), static_cast<ssize_t>(bytes.size()));
+    void sendBytes(int peer, const Bytes& bytes, const std::vector<int>& descriptors = {}) {
+        ASSERT_EQ(sendMessage(peer, bytes, descriptors, 0), static_cast<ssize_t>(bytes.size()));
     }
 
     /** Waits until the server has turned the peer away. */

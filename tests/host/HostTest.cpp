@@ -4,6 +4,7 @@
 #include "tests/host/HostTest.h"
 
 #include <fcntl.h>
+#include <hidl/HidlBinderSupport.h>
 #include <poll.h>
 #include <signal.h>
 #include <stdlib.h>
@@ -37,6 +38,13 @@ std::string call(const sp<IWifiService>& service, const std::string& script) {
     std::string result;
     auto called = service->RunRxStop(script, [&](const auto& out) { result = out; });
     return called.isOk() ? result : called.description();
+}
+
+void fillCall(android::hardware::Parcel* parcel, const android::hardware::hidl_string& text) {
+    size_t parent;
+    ASSERT_EQ(parcel->writeInterfaceToken(IWifiService::descriptor), android::OK);
+    ASSERT_EQ(parcel->writeBuffer(&text, sizeof(text), &parent), android::OK);
+    ASSERT_EQ(writeEmbeddedToParcel(text, parcel, parent, 0), android::OK);
 }
 
 ServerProcess::ServerProcess(const std::vector<std::string>& steps, int tag) {

@@ -5,6 +5,7 @@
 
 #include <android-base/unique_fd.h>
 #include <gtest/gtest.h>
+#include <hwbinder/Parcel.h>
 #include <sys/types.h>
 #include <vendor/korvan/bex/wifi/1.0/IWifiService.h>
 
@@ -26,6 +27,9 @@ std::string transportFailure(const std::string& error);
 
 /** RunRxStop(script): its text, or the description of its failure. */
 std::string call(const sp<IWifiService>& service, const std::string& script);
+
+/** Writes a request for RunRxStop(text), which must outlive the parcel. */
+void fillCall(android::hardware::Parcel* parcel, const android::hardware::hidl_string& text);
 
 /** The words that start hidl-test-server; its own arguments follow. */
 const std::vector<std::string> kServerCommand = {HIDL_TEST_SERVER};

@@ -36,11 +36,8 @@ std::unique_ptr<Session> startCall(const char* script) {
             Session::open(android::hardware::host::socketPath(IWifiService::descriptor, "default"));
     EXPECT_NE(session, nullptr);
     android::hardware::Parcel data;
-    android::hardware::hidl_string text = script;
-    size_t parent;
-    EXPECT_EQ(data.writeInterfaceToken(IWifiService::descriptor), OK);
-    EXPECT_EQ(data.writeBuffer(&text, sizeof(text), &parent), OK);
-    EXPECT_EQ(writeEmbeddedToParcel(text, &data, parent, 0), OK);
+    const android::hardware::hidl_string text = script;
+    fillCall(&data, text);
     FrameHeader header;
     header.code = 16;
     EXPECT_EQ(sendFrame(session->first(), header, &data, 0), OK);
