@@ -18,7 +18,7 @@ void runCommand(const std::string& cmd, const char* tag, CommandResult& result) 
     if (stream == nullptr) return;
 
     std::string collected;
-    char piece[256];
+    char piece[256] = {};
     while (fgets(piece, sizeof(piece), stream) != nullptr) {
         if (piece[0] == '\0') continue;
         __android_log_print(ANDROID_LOG_DEBUG, tag, "%s", piece);
