@@ -30,15 +30,16 @@ base::unique_fd connectTo(const std::string& path, FileIdentity* identity) {
         if (FileIdentity::of(path, identity) != OK) return {};
         base::unique_fd connection(::socket(AF_UNIX, SOCK_SEQPACKET | SOCK_CLOEXEC, 0));
         if (!connection.ok()) return {};
-        if (TEMP_FAILURE_RETRY(connect(connection.get(), reinterpret_cast<sockaddr*>(&address),
-                                       sizeof(address))) != 0) {
-            if (errno != ECONNREFUSED && errno != ENOENT) {
-                ALOGE("%s: %s", path.c_str(), strerror(errno));
-            }
-            return {};
-        }
+        const int failed = TEMP_FAILURE_RETRY(
+                connect(connection.get(), reinterpret_cast<sockaddr*>(&address), sizeof(address)));
+        const int error = errno;
+        // Whatever came of it, a socket that was replaced meanwhile is not the one that is meant.
         FileIdentity after;
         if (FileIdentity::of(path, &after) != OK || !(after == *identity)) continue;
+        if (failed != 0) {
+            if (error != ECONNREFUSED) ALOGE("%s: %s", path.c_str(), strerror(error));
+            return {};
+        }
         if (isTrustedPeer(connection.get())) return connection;
         ALOGE("%s belongs to another user", path.c_str());
         return {};
