@@ -321,6 +321,7 @@ TEST_F(FrameTest, PeersThatLeaveBeforeTheirAnswer) {
     server->openGate();
     EXPECT_EQ(first.get() + second.get(), "donedone");
     EXPECT_TRUE(comesDownTo(before - 8));
+    EXPECT_EQ(descriptorsOfServer(), before - 8);
 }
 
 // Too many at once: the server keeps descriptors for its own work and goes on.
