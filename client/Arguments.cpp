@@ -6,7 +6,7 @@
 #include <cstdlib>
 #include <string_view>
 
-#include "client/Json.h"
+#include "client/base/Json.h"
 
 namespace vendor::korvan::bex::wifi::client {
 namespace {

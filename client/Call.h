@@ -8,6 +8,7 @@
 #include <optional>
 
 #include "client/Commands.h"
+#include "client/base/Service.h"
 
 // Finding the service and calling it, with a deadline.
 //
@@ -18,9 +19,6 @@
 // their static objects alone.
 
 namespace vendor::korvan::bex::wifi::client {
-
-/** Finds the service; null when there is none. */
-using FindService = std::function<::android::sp<IWifiService>()>;
 
 /** How a call ended. */
 enum class Ending {

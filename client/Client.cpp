@@ -9,7 +9,7 @@
 
 #include "client/Arguments.h"
 #include "client/Help.h"
-#include "client/Json.h"
+#include "client/base/Json.h"
 
 namespace vendor::korvan::bex::wifi::client {
 namespace {

@@ -9,7 +9,7 @@
 #include <vector>
 
 #include "client/Call.h"
-#include "client/Doctor.h"
+#include "client/doctor/Doctor.h"
 
 // The command line client, without a process around it.
 

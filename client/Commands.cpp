@@ -7,7 +7,7 @@
 
 #include <optional>
 
-#include "client/Json.h"
+#include "client/base/Json.h"
 
 namespace vendor::korvan::bex::wifi::client {
 namespace {

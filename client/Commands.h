@@ -3,10 +3,10 @@
 
 #pragma once
 
-#include <vendor/korvan/bex/wifi/1.0/IWifiService.h>
-
 #include <string>
 #include <vector>
+
+#include "client/base/Service.h"
 
 // The table of the interface's methods: what each is called, takes, answers, and how it is called.
 // It works on any IWifiService, a proxy as well as an object in the same process:
@@ -18,8 +18,6 @@
 //     if (answer.delivered) std::cout << answer.text << '\n';
 
 namespace vendor::korvan::bex::wifi::client {
-
-using V1_0::IWifiService;
 
 /** What an argument means. Several methods share one kind; the name is the interface's. */
 struct ArgumentKind {

@@ -12,7 +12,7 @@
 #include <sstream>
 
 #include "client/Commands.h"
-#include "client/DoctorNeeds.h"
+#include "client/doctor/DoctorNeeds.h"
 #include "recorder/RecordedShell.h"
 #include "service/WifiService.h"
 

@@ -13,8 +13,8 @@
 #include <fstream>
 
 #include "FakeService.h"
-#include "client/Doctor.h"
-#include "client/DoctorNeeds.h"
+#include "client/doctor/Doctor.h"
+#include "client/doctor/DoctorNeeds.h"
 
 namespace vendor::korvan::bex::wifi::client {
 

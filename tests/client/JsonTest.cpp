@@ -3,7 +3,7 @@
 
 #include <gtest/gtest.h>
 
-#include "client/Json.h"
+#include "client/base/Json.h"
 
 namespace vendor::korvan::bex::wifi::client {
 namespace {

@@ -17,7 +17,7 @@
 #include <vector>
 
 #include "client/Commands.h"
-#include "client/Json.h"
+#include "client/base/Json.h"
 
 namespace {
 

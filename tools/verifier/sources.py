@@ -13,8 +13,8 @@ import re
 from verifier import blueprint
 
 # Whose sources all go on a phone. In the other folders a host program may have files of its own.
-PHONE_FOLDERS = ("chips", "client", "recorder", "service", "shell", "sniffer", "suites",
-                 "tests/unit")
+PHONE_FOLDERS = ("chips", "client", "client/base", "client/doctor", "recorder", "service", "shell",
+                 "sniffer", "suites", "tests/unit")
 FILE_LISTS = ("srcs", "init_rc", "vintf_fragments", "corpus", "data")
 MODULE_LISTS = ("defaults", "static_libs", "header_libs")
 OURS = "bex-wifi-"

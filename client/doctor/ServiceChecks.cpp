@@ -1,7 +1,7 @@
 // Copyright 2026 The BEX Wi-Fi Authors
 // SPDX-License-Identifier: Apache-2.0
 
-#include "client/ServiceChecks.h"
+#include "client/doctor/ServiceChecks.h"
 
 #include <android-base/properties.h>
 #include <unistd.h>
@@ -10,9 +10,9 @@
 #include <climits>
 #include <cstdio>
 
-#include "client/Json.h"
-#include "client/PhoneFiles.h"
-#include "client/Questions.h"
+#include "client/base/Json.h"
+#include "client/doctor/PhoneFiles.h"
+#include "client/doctor/Questions.h"
 
 namespace vendor::korvan::bex::wifi::client {
 namespace {

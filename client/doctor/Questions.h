@@ -12,7 +12,7 @@
 #include <string>
 #include <thread>
 
-#include "client/Commands.h"
+#include "client/base/Service.h"
 
 // What the doctor asks the service manager and the service. All but ownHash() may block for ever:
 //

@@ -1,11 +1,11 @@
 // Copyright 2026 The BEX Wi-Fi Authors
 // SPDX-License-Identifier: Apache-2.0
 
-#include "client/Check.h"
+#include "client/doctor/Check.h"
 
 #include <algorithm>
 
-#include "client/Json.h"
+#include "client/base/Json.h"
 
 namespace vendor::korvan::bex::wifi::client {
 namespace {

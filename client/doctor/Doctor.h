@@ -9,8 +9,8 @@
 #include <functional>
 #include <string>
 
-#include "client/Call.h"
-#include "client/Check.h"
+#include "client/base/Service.h"
+#include "client/doctor/Check.h"
 
 // `bex-wifi-client doctor`: which of the things that keep a client from using the service can be
 // seen from where the client runs.

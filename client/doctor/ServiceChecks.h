@@ -3,7 +3,7 @@
 
 #pragma once
 
-#include "client/Doctor.h"
+#include "client/doctor/Doctor.h"
 
 namespace vendor::korvan::bex::wifi::client {
 

@@ -7,7 +7,7 @@
 #include <string>
 
 #include "chips/ChipFamily.h"
-#include "client/Check.h"
+#include "client/doctor/Check.h"
 
 // What the service's command lines need: each function makes the checks of one kind. A family is
 // missing when the phone names no known vendor.

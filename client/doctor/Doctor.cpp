@@ -1,12 +1,12 @@
 // Copyright 2026 The BEX Wi-Fi Authors
 // SPDX-License-Identifier: Apache-2.0
 
-#include "client/Doctor.h"
+#include "client/doctor/Doctor.h"
 
 #include <iterator>
 
-#include "client/PhoneChecks.h"
-#include "client/ServiceChecks.h"
+#include "client/doctor/PhoneChecks.h"
+#include "client/doctor/ServiceChecks.h"
 
 namespace vendor::korvan::bex::wifi::client {
 namespace {

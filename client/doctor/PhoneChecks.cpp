@@ -1,16 +1,16 @@
 // Copyright 2026 The BEX Wi-Fi Authors
 // SPDX-License-Identifier: Apache-2.0
 
-#include "client/PhoneChecks.h"
+#include "client/doctor/PhoneChecks.h"
 
 #include <android-base/properties.h>
 
 #include <cctype>
 #include <cstring>
 
-#include "client/DoctorNeeds.h"
-#include "client/Json.h"
-#include "client/PhoneFiles.h"
+#include "client/base/Json.h"
+#include "client/doctor/DoctorNeeds.h"
+#include "client/doctor/PhoneFiles.h"
 #include "suites/DriverModules.h"
 
 namespace vendor::korvan::bex::wifi::client {

@@ -1,7 +1,7 @@
 // Copyright 2026 The BEX Wi-Fi Authors
 // SPDX-License-Identifier: Apache-2.0
 
-#include "client/DoctorNeeds.h"
+#include "client/doctor/DoctorNeeds.h"
 
 #include <cstdlib>
 

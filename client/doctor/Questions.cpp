@@ -1,7 +1,7 @@
 // Copyright 2026 The BEX Wi-Fi Authors
 // SPDX-License-Identifier: Apache-2.0
 
-#include "client/Questions.h"
+#include "client/doctor/Questions.h"
 
 namespace vendor::korvan::bex::wifi::client {
 
