@@ -7,14 +7,11 @@
 
 #include <optional>
 
+#include "client/MethodCall.h"
 #include "client/base/Json.h"
 
 namespace vendor::korvan::bex::wifi::client {
 namespace {
-
-using ::android::hardware::hidl_string;
-using ::android::hardware::Return;
-using Values = std::vector<Value>;
 
 constexpr auto kText = ArgumentKind::Type::text;
 constexpr auto kBoolean = ArgumentKind::Type::boolean;
@@ -67,145 +64,87 @@ constexpr ResultKind
              "number when the chip's tool printed none", "failure", kCommandLog};
 // clang-format on
 
-std::string printed(int32_t number) {
-    return std::to_string(number);
-}
-
-std::string printed(bool flag) {
-    return flag ? "true" : "false";
-}
-
-template <typename T>
-Answer answer(const Return<T>& result) {
-    if (!result.isOk()) return {false, "", result.description()};
-    return {true, printed(static_cast<T>(result)), ""};
-}
-
-// For the methods that answer through a callback, which `call` gets as its only argument.
-template <typename Call>
-Answer answerText(Call call) {
-    std::optional<std::string> text;
-    bool again = false;
-    const Return<void> result = call([&](const hidl_string& out) {
-        again = text.has_value();
-        text.emplace(out.c_str(), out.size());
-    });
-    if (!result.isOk()) return {false, "", result.description()};
-    if (!text) return {false, "", "the method returned without an answer"};
-    if (again) return {false, "", "the method answered more than once"};
-    return {true, *text, ""};
-}
-
 const std::vector<Command> kCommands = {
         {"snifferStart",
          "Puts the driver into monitor mode on a channel and starts the packet capture.",
          {&kChannel, &kBandwidth},
          &kStatus,
-         [](IWifiService& wifi, const Values& v) {
-             return answer(wifi.snifferStart(v[0].text, v[1].text));
-         }},
+         callMethod<&IWifiService::snifferStart>},
         {"snifferStop",
          "Ends the packet capture and monitor mode; leaves the interface down.",
          {},
          &kStatus,
-         [](IWifiService& wifi, const Values&) { return answer(wifi.snifferStop()); }},
+         callMethod<&IWifiService::snifferStop>},
         {"isSnifferMode",
          "Tells whether the driver is in monitor mode.",
          {},
          &kMonitor,
-         [](IWifiService& wifi, const Values&) { return answer(wifi.isSnifferMode()); }},
+         callMethod<&IWifiService::isSnifferMode>},
         {"getWlanMode",
          "Reads the driver's connection mode.",
          {},
          &kMode,
-         [](IWifiService& wifi, const Values&) { return answer(wifi.getWlanMode()); }},
+         callMethod<&IWifiService::getWlanMode>},
         {"isMimoSupport",
          "Tells whether the device declares MIMO support.",
          {},
          &kMimo,
-         [](IWifiService& wifi, const Values&) { return answer(wifi.isMimoSupport()); }},
+         callMethod<&IWifiService::isMimoSupport>},
         {"RunTxBGStart",
          "Starts continuous 802.11b/g (and a) transmission, until RunTxStop.",
          {&kChannel, &kRate, &kPower, &kTxAntenna},
          &kStatus,
-         [](IWifiService& wifi, const Values& v) {
-             return answer(wifi.RunTxBGStart(v[0].text, v[1].text, v[2].text, v[3].text));
-         }},
+         callMethod<&IWifiService::RunTxBGStart>},
         {"RunTxNStart",
          "Starts continuous 802.11n or 802.11ac transmission, until RunTxStop.",
          {&kChannel, &kNarrowBandwidth, &kMcs, &kPower, &kVht, &kTxAntenna},
          &kStatus,
-         [](IWifiService& wifi, const Values& v) {
-             return answer(wifi.RunTxNStart(v[0].text, v[1].text, v[2].text, v[3].text, v[4].flag,
-                                            v[5].text));
-         }},
+         callMethod<&IWifiService::RunTxNStart>},
         {"RunTxAxStart",
          "Starts continuous 802.11ax transmission where the chip supports it, until RunTxStop.",
          {&kChannel, &kBandwidth, &kMcs, &kPower, &kGuardInterval, &kTxAntenna},
          &kStatus,
-         [](IWifiService& wifi, const Values& v) {
-             return answer(wifi.RunTxAxStart(v[0].text, v[1].text, v[2].text, v[3].text, v[4].text,
-                                             v[5].text));
-         }},
+         callMethod<&IWifiService::RunTxAxStart>},
         {"RunTxStop",
          "Ends the transmission on a channel.",
          {&kChannel},
          &kStatus,
-         [](IWifiService& wifi, const Values& v) { return answer(wifi.RunTxStop(v[0].text)); }},
+         callMethod<&IWifiService::RunTxStop>},
         {"RunTxStStart",
          "Starts an unmodulated carrier (single tone), until RunTxStStop.",
          {&kChannel, &kBandwidth, &kTxAntenna},
          &kStatus,
-         [](IWifiService& wifi, const Values& v) {
-             return answer(wifi.RunTxStStart(v[0].text, v[1].text, v[2].text));
-         }},
+         callMethod<&IWifiService::RunTxStStart>},
         {"RunTxStStop",
          "Ends the single tone on a channel.",
          {&kChannel},
          &kStatus,
-         [](IWifiService& wifi, const Values& v) { return answer(wifi.RunTxStStop(v[0].text)); }},
+         callMethod<&IWifiService::RunTxStStop>},
         {"RunRxApJoinHoc",
          "Joins an open access point, for a check over the air.",
          {&kSsid, &kAddress},
          &kStatus,
-         [](IWifiService& wifi, const Values& v) {
-             return answer(wifi.RunRxApJoinHoc(v[0].text, v[1].text));
-         }},
+         callMethod<&IWifiService::RunRxApJoinHoc>},
         {"RunRxBgStart",
          "Starts 802.11b/g (and a) reception with a packet count, until RunRxStop.",
          {&kChannel, &kRate, &kRxAntenna},
          &kStarted,
-         [](IWifiService& wifi, const Values& v) {
-             return answerText([&](auto keep) {
-                 return wifi.RunRxBgStart(v[0].text, v[1].text, v[2].text, keep);
-             });
-         }},
+         callMethod<&IWifiService::RunRxBgStart>},
         {"RunRxNStart",
          "Starts 802.11n or 802.11ac reception with a packet count, until RunRxStop.",
          {&kChannel, &kNarrowBandwidth, &kMcs, &kVht, &kRxAntenna},
          &kStarted,
-         [](IWifiService& wifi, const Values& v) {
-             return answerText([&](auto keep) {
-                 return wifi.RunRxNStart(v[0].text, v[1].text, v[2].text, v[3].flag, v[4].text,
-                                         keep);
-             });
-         }},
+         callMethod<&IWifiService::RunRxNStart>},
         {"RunRxAxStart",
          "Starts 802.11ax reception where the chip supports it, until RunRxStop.",
          {&kChannel, &kBandwidth, &kMcs, &kRxAntenna},
          &kAxStarted,
-         [](IWifiService& wifi, const Values& v) {
-             return answerText([&](auto keep) {
-                 return wifi.RunRxAxStart(v[0].text, v[1].text, v[2].text, v[3].text, keep);
-             });
-         }},
+         callMethod<&IWifiService::RunRxAxStart>},
         {"RunRxStop",
          "Ends the reception and reads its packet count.",
          {&kChannel},
          &kPackets,
-         [](IWifiService& wifi, const Values& v) {
-             return answerText([&](auto keep) { return wifi.RunRxStop(v[0].text, keep); });
-         }},
+         callMethod<&IWifiService::RunRxStop>},
 };
 
 std::optional<bool> readFlag(const std::string& text) {
