@@ -3,7 +3,10 @@
 
 #include "client/Arguments.h"
 
+#include <android-base/strings.h>
+
 #include <cstdlib>
+#include <cstring>
 #include <string_view>
 
 #include "client/base/Json.h"
@@ -11,8 +14,10 @@
 namespace vendor::korvan::bex::wifi::client {
 namespace {
 
+using ::android::base::StartsWith;
+
 constexpr char kTimeout[] = "--timeout";
-constexpr std::string_view kTimeoutEquals = "--timeout=";
+constexpr char kTimeoutEquals[] = "--timeout=";
 // Eleven days: longer than any call, and far from where the clock's arithmetic overflows.
 constexpr double kLongestTimeout = 1e6;
 
@@ -23,7 +28,7 @@ bool isDecimal(std::string_view text) {
 }
 
 bool isOption(std::string_view argument) {
-    return argument.size() > 1 && argument[0] == '-' && !isDecimal(argument.substr(1));
+    return argument.size() > 1 && StartsWith(argument, '-') && !isDecimal(argument.substr(1));
 }
 
 bool readTimeout(const std::string& text, CommandLine* line, std::string* problem) {
@@ -53,8 +58,8 @@ bool readCommandLine(const std::vector<std::string>& arguments, CommandLine* lin
             line->help = true;
         } else if (*argument == "--json") {
             line->json = true;
-        } else if (argument->compare(0, kTimeoutEquals.size(), kTimeoutEquals) == 0) {
-            if (!readTimeout(argument->substr(kTimeoutEquals.size()), line, problem)) return false;
+        } else if (StartsWith(*argument, kTimeoutEquals)) {
+            if (!readTimeout(argument->substr(strlen(kTimeoutEquals)), line, problem)) return false;
         } else if (*argument == kTimeout) {
             if (++argument == arguments.end()) {
                 *problem = "--timeout takes a number of seconds";

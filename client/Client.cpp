@@ -3,8 +3,9 @@
 
 #include "client/Client.h"
 
+#include <android-base/stringprintf.h>
+
 #include <cerrno>
-#include <cstdio>
 #include <cstring>
 
 #include "client/Arguments.h"
@@ -75,9 +76,7 @@ Report judge(const Request& request, const Outcome& outcome) {
 
 std::string milliseconds(std::chrono::nanoseconds duration) {
     const long long us = std::chrono::duration_cast<std::chrono::microseconds>(duration).count();
-    char text[32];
-    snprintf(text, sizeof(text), "%lld.%03lld", us / 1000, us % 1000);
-    return text;
+    return ::android::base::StringPrintf("%lld.%03lld", us / 1000, us % 1000);
 }
 
 /** The object with the members that end every report. */

@@ -3,7 +3,7 @@
 
 #include "client/Commands.h"
 
-#include <strings.h>
+#include <android-base/strings.h>
 
 #include <optional>
 
@@ -155,15 +155,13 @@ std::optional<bool> readFlag(const std::string& text) {
 
 std::string wrongCount(const Command& command, size_t given) {
     const size_t expected = command.arguments.size();
-    std::string problem = std::string(command.name) + " takes " +
-                          (expected == 0 ? "no" : std::to_string(expected)) +
-                          (expected == 1 ? " argument" : " arguments");
-    const char* separator = " (";
-    for (const ArgumentKind* argument : command.arguments) {
-        problem.append(separator).append(argument->name);
-        separator = " ";
-    }
-    return problem + (expected == 0 ? "" : ")") + ", not " + std::to_string(given);
+    std::vector<const char*> names;
+    for (const ArgumentKind* argument : command.arguments) names.push_back(argument->name);
+    return std::string(command.name) + " takes " +
+           (expected == 0 ? "no" : std::to_string(expected)) +
+           (expected == 1 ? " argument" : " arguments") +
+           (expected == 0 ? "" : " (" + ::android::base::Join(names, ' ') + ")") + ", not " +
+           std::to_string(given);
 }
 
 } // namespace
@@ -186,7 +184,7 @@ const Command* findCommand(const std::string& name) {
 std::string unknownCommand(const std::string& name) {
     std::string problem = "unknown method " + jsonString(name);
     for (const Command& command : kCommands) {
-        if (strcasecmp(name.c_str(), command.name) == 0) {
+        if (::android::base::EqualsIgnoreCase(name, command.name)) {
             problem.append(": did you mean ").append(command.name).append("?");
         }
     }

@@ -4,9 +4,11 @@
 #include "client/doctor/PhoneChecks.h"
 
 #include <android-base/properties.h>
+#include <android-base/strings.h>
 
 #include <cctype>
 #include <cstring>
+#include <iterator>
 
 #include "client/base/Json.h"
 #include "client/doctor/DoctorNeeds.h"
@@ -17,6 +19,8 @@ namespace vendor::korvan::bex::wifi::client {
 namespace {
 
 using ::android::base::GetProperty;
+using ::android::base::Join;
+using ::android::base::StartsWith;
 using V1_0::implementation::kDriverDir;
 using V1_0::implementation::kDriverPrefix;
 using V1_0::implementation::kFwPathCandidates;
@@ -125,16 +129,16 @@ Check checkName(const std::string& root, const std::string& tool) {
 }
 
 Check checkModuleCandidates(const std::string& root) {
-    std::string places;
+    const std::vector<const char*> places(std::begin(kFwPathCandidates),
+                                          std::end(kFwPathCandidates));
     std::optional<Check> hidden;
-    for (const char* candidate : kFwPathCandidates) {
+    for (const char* candidate : places) {
         const FileState state = look(root + candidate);
         if (state.exists() && (state.mode & 0444) != 0) return ok("module", candidate);
         if (state.hidden()) hidden = unseen("module", candidate, state);
-        places += (places.empty() ? "" : ", ") + std::string(candidate);
     }
     if (hidden) return *hidden;
-    return problem("module", "none can be read of " + places,
+    return problem("module", "none can be read of " + Join(places, ", "),
                    "install the driver's module in one of these places and restart the service, "
                    "which looks for it once");
 }
@@ -142,11 +146,13 @@ Check checkModuleCandidates(const std::string& root) {
 Check checkModuleFolder(const std::string& root) {
     const Folder folder = listFolder(root + kDriverDir);
     if (folder.hidden()) return unseen("module", kDriverDir, {folder.error, 0, 0});
-    std::string modules;
+    std::vector<std::string> modules;
     for (const std::string& name : folder.names) {
-        if (name.rfind(kDriverPrefix, 0) == 0) modules += (modules.empty() ? "" : ", ") + name;
+        if (StartsWith(name, kDriverPrefix)) modules.push_back(name);
     }
-    if (!modules.empty()) return ok("module", std::string(kDriverDir) + ": " + modules);
+    if (!modules.empty()) {
+        return ok("module", std::string(kDriverDir) + ": " + Join(modules, ", "));
+    }
     return problem("module", std::string("no ") + kDriverPrefix + "* in " + kDriverDir,
                    "install the driver's modules there and restart the service, which looks for "
                    "them once");
@@ -243,17 +249,18 @@ Checks checkDriver(const std::string& root, std::optional<ChipFamily> family) {
 
 Check checkCommandLog() {
     std::string found;
-    std::string remedy;
+    std::vector<std::string> remedies;
     for (const std::string& tag : kCommandTags) {
         const std::string cause = debugHiddenBy(tag);
         if (cause.empty()) continue;
         const std::string persistent = "persist.log.tag." + tag;
         if (found.empty()) found = cause + " is " + jsonString(GetProperty(cause, "")) + ": ";
-        remedy += std::string(remedy.empty() ? "" : "; ") + "setprop " +
-                  (cause == persistent ? persistent : "log.tag." + tag) + " D";
+        remedies.push_back("setprop " + (cause == persistent ? persistent : "log.tag." + tag) +
+                           " D");
     }
-    if (remedy.empty()) return ok("command-log", "logcat | grep 'cmd:' shows which commands run");
-    return problem("command-log", found + "the log does not show all commands that run", remedy);
+    if (remedies.empty()) return ok("command-log", "logcat | grep 'cmd:' shows which commands run");
+    return problem("command-log", found + "the log does not show all commands that run",
+                   Join(remedies, "; "));
 }
 
 } // namespace vendor::korvan::bex::wifi::client

@@ -3,6 +3,7 @@
 
 #include "client/doctor/PhoneFiles.h"
 
+#include <android-base/strings.h>
 #include <dirent.h>
 
 #include <algorithm>
@@ -14,16 +15,17 @@
 namespace vendor::korvan::bex::wifi::client {
 namespace {
 
+using ::android::base::EndsWith;
+using ::android::base::StartsWith;
+
 constexpr std::string_view kBlanks = " \t\r\n";
-constexpr std::string_view kXml = ".xml";
 
 bool isAbsence(int error) {
     return error == ENOENT || error == ENOTDIR;
 }
 
 bool isXml(const std::string& name, const std::string& prefix) {
-    return name.size() >= kXml.size() && name.compare(0, prefix.size(), prefix) == 0 &&
-           name.compare(name.size() - kXml.size(), kXml.size(), kXml) == 0;
+    return StartsWith(name, prefix) && EndsWith(name, ".xml");
 }
 
 std::string withoutComments(std::string text) {

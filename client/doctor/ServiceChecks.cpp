@@ -4,11 +4,12 @@
 #include "client/doctor/ServiceChecks.h"
 
 #include <android-base/properties.h>
+#include <android-base/stringprintf.h>
+#include <android-base/strings.h>
 #include <unistd.h>
 
 #include <algorithm>
 #include <climits>
-#include <cstdio>
 
 #include "client/base/Json.h"
 #include "client/doctor/PhoneFiles.h"
@@ -18,6 +19,9 @@ namespace vendor::korvan::bex::wifi::client {
 namespace {
 
 using ::android::sp;
+using ::android::base::Join;
+using ::android::base::StartsWith;
+using ::android::base::StringPrintf;
 
 constexpr char kInitService[] = "vendor.bex_wifi";
 constexpr char kProgram[] = "/vendor/bin/hw/vendor.korvan.bex.wifi@1.0-service";
@@ -36,12 +40,6 @@ const std::vector<FileSet> kMatrices = {
 };
 
 constexpr char kSeeAnswering[] = "see \"answering\"";
-
-std::string joined(const std::vector<std::string>& words) {
-    std::string text;
-    for (const std::string& word : words) text += (text.empty() ? "" : ", ") + word;
-    return text;
-}
 
 std::string packageName() {
     const std::string descriptor = IWifiService::descriptor;
@@ -66,9 +64,7 @@ class ServiceExamination {
 
   private:
     static std::string seconds(std::chrono::nanoseconds duration) {
-        char text[32];
-        snprintf(text, sizeof(text), "%g", std::chrono::duration<double>(duration).count());
-        return text;
+        return StringPrintf("%g", std::chrono::duration<double>(duration).count());
     }
 
     Check declared();
@@ -128,7 +124,7 @@ Check ServiceExamination::declared() {
 
 Check ServiceExamination::manifest() const {
     const char* name = "manifest";
-    const std::string files = joined(mManifests.files);
+    const std::string files = Join(mManifests.files, ", ");
     if (mManifests.files.size() == 1) return ok(name, "one entry, in " + files);
     if (mManifests.files.size() > 1) {
         return problem(name, "more than one entry: " + files,
@@ -265,7 +261,7 @@ Check ServiceExamination::program() const {
     const ssize_t length = readlink((mPhone.root + link).c_str(), target, sizeof(target));
     if (length < 0) return unknown(name, link + " cannot be read", "run this as root");
     const std::string path(target, length);
-    if (path.rfind("/vendor/", 0) != 0) {
+    if (!StartsWith(path, "/vendor/")) {
         return problem(name,
                        jsonString(path) +
                                " is not below /vendor/, so its commands get the "
