@@ -61,8 +61,9 @@ Report judge(const Request& request, const Outcome& outcome) {
                             jsonString(outcome.answer.transportError)};
         case Ending::lateFinding:
             return {kTooLate,
-                    "the deadline passed while waiting for the service: is "
-                    "vendor.korvan.bex.wifi@1.0-service running?"};
+                    "vendor.korvan.bex.wifi@1.0-service has not answered in time: it may be busy "
+                    "with "
+                    "other calls or not running"};
         case Ending::lateCalling:
             return {kTooLate, "the deadline passed in " + method +
                                       ": the service's commands may still be running"};

@@ -3,6 +3,7 @@
 
 #pragma once
 
+#include <android/hidl/manager/1.0/IServiceManager.h>
 #include <hidl/ServiceManagement.h>
 
 #include <chrono>

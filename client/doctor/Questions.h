@@ -3,7 +3,7 @@
 
 #pragma once
 
-#include <hidl/ServiceManagement.h>
+#include <android/hidl/manager/1.0/IServiceManager.h>
 
 #include <chrono>
 #include <functional>

@@ -112,7 +112,8 @@ Check ServiceExamination::declared() {
     }
     if (mManifests.files.empty()) {
         return problem(name,
-                       "not in the VINTF manifest: the service registers, but clients get null",
+                       "not in the VINTF manifest: the service may not register, or clients get "
+                       "null",
                        std::string("install ") + kFragment + " and reboot");
     }
     return problem(name,
@@ -187,8 +188,10 @@ Check ServiceExamination::registered() {
         return unknown(name, "clients get null as long as it is not declared",
                        "mend \"declared\" first; lshal shows what is registered");
     }
-    return problem(name, "no service is registered: getService waits for ever",
-                   std::string("start ") + kInitService +
+    return problem(name, "no service is registered: getService waits until there is one",
+                   std::string("look again, since a search makes init start a service that is "
+                               "stopped; start ") +
+                           kInitService +
                            "; when it runs, hwservice_contexts or its right to \"add\", or this "
                            "user's to \"find\", is missing: logcat | grep "
                            "'avc.*hwservice_manager'");

@@ -191,8 +191,9 @@ TEST_F(ClientDeadlineTest, ExitCode5InTheSearch) {
     EXPECT_EQ(run({"RunTxStop", "6", "--timeout", "0.05"}), 5);
     EXPECT_EQ(out(), "");
     EXPECT_EQ(err(),
-              "bex-wifi-client: the deadline passed while waiting for the service: is "
-              "vendor.korvan.bex.wifi@1.0-service running?\n");
+              "bex-wifi-client: vendor.korvan.bex.wifi@1.0-service has not answered in time: it "
+              "may "
+              "be busy with other calls or not running\n");
 }
 
 TEST_F(ClientDeadlineTest, ExitCode5InTheCall) {

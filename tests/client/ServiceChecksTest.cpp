@@ -21,7 +21,8 @@ TEST_F(ServiceChecksTest, Declared) {
     expectOnly("declared", "does not give it to this user",
                "in /vendor/etc/vintf/manifest/wifi.xml");
     remove(kFragment);
-    expect(check("declared"), Verdict::problem, "clients get null", "install /vendor/etc/vintf/");
+    expect(check("declared"), Verdict::problem, "the service may not register",
+           "install /vendor/etc/vintf/");
     mManager->refuses = true;
     expect(check("declared"), Verdict::problem, "cannot be asked", "as root");
     mManager = nullptr;
@@ -79,7 +80,7 @@ TEST_F(ServiceChecksTest, Init) {
 TEST_F(ServiceChecksTest, NotRegistered) {
     expectOk("registered", "found");
     mService = nullptr;
-    expectOnly("registered", "getService waits for ever", "start vendor.bex_wifi");
+    expectOnly("registered", "getService waits until there is one", "look again");
     expectUnknown("answering", "nobody", "\"registered\"");
     expectUnknown("hash", "does not answer", "\"answering\"");
     mManager->transport = Transport::EMPTY;
