@@ -37,11 +37,10 @@ constexpr char kInsmodDenied[] =
         "; when insmod is refused, the service lacks the capability sys_module, or \"module_load\" "
         "for the file's label: logcat | grep avc";
 
-// Where a shell looks for a bare name. What lies outside of the first ones a vendor process may not
-// execute, unless its policy makes an exception.
+// Where the service's shell looks for a bare name, as the init script says. What lies outside of the
+// first ones a vendor process may not execute, unless its policy makes an exception.
 constexpr const char* kVendorFolders[] = {"/vendor/bin/", "/vendor/xbin/", "/odm/bin/"};
-constexpr const char* kOtherFolders[] = {"/product/bin/", "/system_ext/bin/", "/system/bin/",
-                                         "/system/xbin/"};
+constexpr const char* kOtherFolders[] = {"/system/bin/", "/system/xbin/"};
 
 Check unseen(const std::string& name, const std::string& path, const FileState& state) {
     return unknown(name, path + ": " + strerror(state.error), "run this as root");

@@ -122,10 +122,8 @@ class Builder:
             os.symlink("../../phone/bin/busybox", f"{self.root}/system/bin/{name}")
 
     def _tool(self, name, script):
-        """A tool stands in /vendor/bin; the link makes it found first on the path."""
         self._copy(f"{SIMULATOR}/tools/{script}", f"/vendor/bin/{name}")
         os.chmod(f"{self.root}/vendor/bin/{name}", 0o755)
-        os.symlink(f"../../vendor/bin/{name}", f"{self.root}/system/bin/{name}")
 
     def _install(self, source, destination):
         self._copy(source, destination)

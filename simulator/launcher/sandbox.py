@@ -20,7 +20,8 @@ import signal
 from launcher.errors import PhoneError
 
 ENVIRONMENT = {
-    "PATH": "/system/bin:/vendor/bin",
+    # As the service's init script sets it.
+    "PATH": "/vendor/bin:/vendor/xbin:/odm/bin:/system/bin:/system/xbin",
     "HOME": "/",
     "TMPDIR": "/data/local/tmp",
     "ANDROID_ROOT": "/system",

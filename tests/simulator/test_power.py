@@ -142,7 +142,7 @@ def test_commands_have_the_phone_s_environment_and_no_descriptors(any_new_phone,
     result = launcher("run", any_new_phone.folder, "sh", "-c", "env; echo leaked >&5", cwd=place)
     assert result.returncode != 0
     assert (place / "leak").read_text() == ""
-    assert "PATH=/system/bin:/vendor/bin\n" in result.stdout
+    assert "PATH=/vendor/bin:/vendor/xbin:/odm/bin:/system/bin:/system/xbin\n" in result.stdout
     assert "SECRET_OF_THE_HOST" not in result.stdout
 
 

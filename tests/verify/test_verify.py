@@ -3,6 +3,7 @@
 """The verifier passes the checkout as it is, and tells the file and line of each disagreement."""
 
 import pathlib
+import re
 import shutil
 import subprocess
 
@@ -15,11 +16,12 @@ XML = "service/vendor.korvan.bex.wifi@1.0-service.xml"
 MATRIX = "service/compatibility_matrix.xml"
 HWSERVICE = "service/sepolicy/hwservice_contexts"
 FILES = "service/sepolicy/file_contexts"
+SANDBOX = "simulator/launcher/sandbox.py"
 
 
 @pytest.fixture(name="copy")
 def copy_of_checkout(tmp_path):
-    skip = shutil.ignore_patterns("build", ".git", "simulator", "docs")
+    skip = shutil.ignore_patterns("build", ".git")
     return shutil.copytree(ROOT, tmp_path / "checkout", ignore=skip)
 
 
@@ -46,6 +48,8 @@ DISAGREEMENTS = [
     ("interface/Android.bp", 'name: "vendor.korvan.bex.wifi"', 'name: "vendor.korvan.bex"',
      "name is not 'vendor.korvan.bex.wifi'"),
     ("interface/Android.bp", "use_current: true", "use_current: false", "use_current is not 'True'"),
+    ("interface/Android.bp", "use_current", 'path: "vendor/korvan/bex/wifi/interface",\n    use_current',
+     "'path' ties the checkout to one place"),
     ("interface/1.0/Android.bp", "wifi@1.0", "wifi@1.1", "name is not 'vendor.korvan.bex.wifi@1.0'"),
     ("interface/1.0/Android.bp", "IWifiService.hal", "types.hal", "srcs is not IWifiService.hal"),
     ("service/CMakeLists.txt", "1.0-service)", "1.0-servant)", "program is not called"),
@@ -56,9 +60,12 @@ DISAGREEMENTS = [
     (RC, "service vendor.bex_wifi /vendor/bin/hw/vendor", "service vendor.bex_wifi /vendor/bin/vendor",
      "starts /vendor/bin/vendor.korvan.bex.wifi@1.0-service, not"),
     (RC, "service vendor.bex_wifi", "service bex_wifi", "does not begin with 'vendor.'"),
-    (RC, "1.0::IWifiService default", "1.0::IWifiService first", "is no interface of the service"),
-    (RC, "interface android.hidl.base@1.0::IBase", "interface android.hidl.base@1.1::IBase",
-     "is no interface of the service"),
+    (RC, "1.0::IWifiService default", "1.0::IWifiService first", "is not the service's own interface"),
+    (RC, "    class hal", "    interface android.hidl.base@1.0::IBase default\n    class hal",
+     "is not the service's own interface"),
+    (SANDBOX, "/vendor/bin:/vendor/xbin", "/vendor/xbin:/vendor/bin", "PATH is not '/vendor/bin:"),
+    ("client/PhoneChecks.cpp", 'Folders[] = {"/vendor/bin/"', 'Folders[] = {"/odm/bin/"',
+     "the folders are not '/vendor/bin:"),
     (XML, "<name>vendor.korvan.bex.wifi<", "<name>vendor.korvan.wifi<", "not 'vendor.korvan.bex.wifi'"),
     (XML, "<version>1.0<", "<version>1.1<", "version is '1.1', not '1.0'"),
     (XML, "<name>IWifiService<", "<name>IWifi<", "interface/name is 'IWifi', not 'IWifiService'"),
@@ -72,10 +79,14 @@ DISAGREEMENTS = [
     (FILES, r"wifi@1\.0-service", r"wifi@1.0-service", "is not labelled bex_wifi_exec"),
     (FILES, "bex_wifi_exec", "vendor_file", "is not labelled bex_wifi_exec"),
     ("service/product.mk", "1.0-service", "1.1-service", "has a module 'vendor.korvan.bex.wifi@1.1"),
-    ("service/board.mk", "service/sepolicy", "service/policy", "there is no vendor/korvan/bex/wifi/se"),
+    ("service/board.mk", "# Copyright", "DEVICE_FRAMEWORK_COMPATIBILITY_MATRIX_FILE := x\n#",
+     "there is no x"),
+    ("service/board.mk", "# Copyright", "BOARD_SEPOLICY_DIRS += x\n#", "a user build gets something"),
     ("shell/Android.bp", '"Command.cpp"', '"Commands.cpp"', "there is no shell/Commands.cpp"),
     ("shell/CMakeLists.txt", "Command.cpp", "Commands.cpp", "there is no shell/Commands.cpp"),
     ("sniffer/Android.bp", '"bex-wifi-shell"', '"bex-wifi-shells"', "no module 'bex-wifi-shells'"),
+    ("tests/target/Android.bp", '"libutils"', '"libhidl_gtest_helper"',
+     "'libhidl_gtest_helper' is not known to be there for vendor modules"),
     ("tests/unit/Android.bp", ":bex-wifi-recorder", ":bex-recorder", "no module 'bex-recorder'"),
 ]
 
@@ -89,6 +100,25 @@ def test_a_disagreement_is_told_with_its_line(copy, path, old, new, told):
     assert verified.returncode == 1, verified.stderr
     assert [text for text in verified.stderr.splitlines()
             if text.startswith(f"{path}:{line}: ") and told in text], verified.stderr
+
+
+@pytest.mark.parametrize("tool", ["busybox", "ping", "wl"])
+def test_a_tool_without_a_label(copy, tool):
+    file = copy / FILES
+    file.write_text(re.sub(rf"\b{tool}\b(\||\))", r"x\1", file.read_text()))
+    assert f"{FILES}:1: does not label {tool}, which docs/commands/" in verify(copy).stderr
+
+
+@pytest.mark.parametrize("old, new, told", [
+    ("BEX_WIFI_SERVICE :=", "BEX_WIFI_SERVICE =", "there is no /dev/sepolicy"),
+    ("/sepolicy", "/policy", "there is no service/policy"),
+    ("compatibility_matrix", "matrix", "does not add service/compatibility_matrix.xml"),
+    ("BEX_WIFI_SERVICE :=", "BEX_WIFI_SERVICE := x#", "does not add service/sepolicy"),
+])
+def test_what_the_board_includes(copy, old, new, told):
+    file = copy / "service/board.mk"
+    file.write_text(file.read_text().replace(old, new))
+    assert told in verify(copy).stderr
 
 
 def test_a_source_that_soong_lacks(copy):

@@ -39,7 +39,6 @@ class Names:
         self.interface = interface[1]
         self.instance = instance[1]
         self.versioned = f"{self.package}@{self.version}"
-        self.chain = [f"{self.versioned}::{self.interface}", "android.hidl.base@1.0::IBase"]
         self.service = service_module(checkout)
 
 
@@ -92,6 +91,9 @@ def hidl_modules(checkout, names):
     root, = blueprint.read(checkout, "interface/Android.bp")
     expect(checkout, root, "name", names.package)
     expect(checkout, root, "use_current", True)
+    if root.get("path") is not None:
+        checkout.report(root.path, root.line_of("path"),
+                        "'path' ties the checkout to one place; without it Soong takes the folder")
     interface, = blueprint.read(checkout, f"interface/{names.version}/Android.bp")
     expect(checkout, interface, "name", names.versioned)
     expect(checkout, interface, "root", names.package)
@@ -125,13 +127,14 @@ def init_script(checkout, names):
         checkout.report(path, line, f"starts {started[2]}, not {names.service.name} of Soong")
     if not started[1].startswith("vendor."):
         checkout.report(path, line, f"the name '{started[1]}' does not begin with 'vendor.'")
-    expected = [f"interface {name} {names.instance}" for name in names.chain]
+    # Without the base interface: of two services that claim it, init refuses one.
+    expected = f"interface {names.versioned}::{names.interface} {names.instance}"
     options = [(number, " ".join(text.split())) for number, text in checkout.lines(path)]
     for number, option in options:
-        if option.startswith("interface ") and option not in expected:
-            checkout.report(path, number, f"'{option}' is no interface of the service")
-    for option in set(expected) - {option for _, option in options}:
-        checkout.report(path, line, f"lacks '{option}'")
+        if option.startswith("interface ") and option != expected:
+            checkout.report(path, number, f"'{option}' is not the service's own interface")
+    if expected not in [option for _, option in options]:
+        checkout.report(path, line, f"lacks '{expected}'")
     given = {option.split()[0] for _, option in options}
     for option in ("class", "user", "group", "capabilities"):
         if option not in given:
@@ -219,7 +222,7 @@ def file_context(checkout, names):
 
 
 def makefiles(checkout, names):
-    """What the device's makefiles take in exists, as modules and below Soong's package root."""
+    """What the device's makefiles take in exists, as modules and files."""
     known = {module.name for path in checkout.blueprints()
              for module in blueprint.read(checkout, path)}
     packages = [(number, word) for number, line in checkout.lines(PRODUCT)
@@ -229,10 +232,26 @@ def makefiles(checkout, names):
             checkout.report(PRODUCT, number, f"no Android.bp has a module '{package}'")
     if names.service.name not in [package for _, package in packages]:
         checkout.report(PRODUCT, 1, f"lacks '{names.service.name}'")
-    root, = blueprint.read(checkout, "interface/Android.bp")
-    home = root.get("path").removesuffix("interface")
-    for number, line in checkout.lines(BOARD):
-        for word in line.split():
-            if word.startswith("vendor/") and not (
-                    word.startswith(home) and (checkout.root / word.removeprefix(home)).exists()):
-                checkout.report(BOARD, number, f"there is no {word}: this checkout is {home}")
+    for path in board_files(checkout):
+        if not (checkout.root / path).exists():
+            checkout.report(BOARD, 1, f"there is no {path}")
+    for path in (POLICY, MATRIX):
+        if path not in board_files(checkout):
+            checkout.report(BOARD, 1, f"does not add {path}")
+    if board_files(checkout, "user"):
+        checkout.report(BOARD, 1, "a user build gets something of it")
+
+
+def board_files(checkout, variant="userdebug"):
+    """What the device gets by including the file, on the way to another makefile."""
+    board_config = f"""
+BOARD_SEPOLICY_DIRS =
+include {BOARD}
+include /dev/null
+print: ; @echo $(BOARD_SEPOLICY_DIRS) $(DEVICE_FRAMEWORK_COMPATIBILITY_MATRIX_FILE)
+"""
+    made = subprocess.run(["make", "-sf", "-", f"TARGET_BUILD_VARIANT={variant}"], cwd=checkout.root,
+                          input=board_config, capture_output=True, text=True, check=False)
+    if made.returncode != 0:
+        raise Unreadable(f"{BOARD}:1", (made.stderr.splitlines() or ["make fails"])[0])
+    return made.stdout.split()
