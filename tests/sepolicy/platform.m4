@@ -75,6 +75,7 @@ define(`vendor_internal_prop', `type $1, property_type;')
 
 attribute domain;
 attribute appdomain;
+attribute coredomain;
 attribute exec_type;
 attribute file_type;
 attribute fs_type;
@@ -84,18 +85,23 @@ attribute vendor_file_type;
 attribute hwservice_manager_type;
 attribute protected_hwservice;
 
-type kernel, domain;
-type init, domain;
-type shell, domain;
-type system_server, domain;
-type hwservicemanager, domain;
+type kernel, domain, coredomain;
+type init, domain, coredomain;
+type vendor_init, domain;
+type shell, domain, coredomain;
+type system_server, domain, coredomain;
+type hwservicemanager, domain, coredomain;
+type platform_app, domain, appdomain, coredomain;
+type priv_app, domain, appdomain, coredomain;
+type system_app, domain, appdomain, coredomain;
 type untrusted_app, domain, appdomain;
 type sysfs, fs_type, sysfs_type;
+type system_lib_file, file_type;
 type vendor_file, vendor_file_type, file_type;
 type vendor_shell_exec, exec_type, vendor_file_type, file_type;
 type vendor_toolbox_exec, exec_type, vendor_file_type, file_type;
 type hwservicemanager_prop, property_type;
 type hidl_base_hwservice, hwservice_manager_type;
 
-# No app may look up what is protected.
-neverallow appdomain protected_hwservice:hwservice_manager find;
+# What "protected" keeps out: the untrusted apps and nobody else.
+neverallow untrusted_app protected_hwservice:hwservice_manager find;

@@ -52,10 +52,23 @@ def test_a_factory_test_client_may_call(compile_policy):
     "allow untrusted_app bex_wifi_hwservice:hwservice_manager find;",
     "allow shell bex_wifi_hwservice:hwservice_manager add;",
     "allow shell bex_wifi:binder call;",
-    "typeattribute untrusted_app bex_wifi_client;",
+    *(f"typeattribute {domain} bex_wifi_client;" for domain in (
+        "untrusted_app", "platform_app", "priv_app", "system_app", "system_server", "shell")),
 ])
 def test_nobody_else_may(compile_policy, rule):
     compiled = compile_policy(rule + "\n")
+    assert compiled.returncode != 0
+    assert "neverallow" in compiled.stderr
+
+
+@pytest.mark.parametrize("rule", [
+    "vendor_init bex_wifi_capture_prop:property_service set;",
+    "bex_wifi system_lib_file:system module_load;",
+    "bex_wifi vendor_file:system module_load;",
+])
+def test_this_is_allowed(compile_policy, rule):
+    """To forbid it makes the compiler name the rule that allows it."""
+    compiled = compile_policy(f"neverallow {rule}\n")
     assert compiled.returncode != 0
     assert "neverallow" in compiled.stderr
 
@@ -74,6 +87,7 @@ def test_labels_are_declared(name):
     ("/system/vendor/bin/hw/vendor.korvan.bex.wifi@1.0-service", "bex_wifi_exec"),
     ("/vendor/bin/hw/vendor_korvan_bex_wifi@1_0-service", None),
     ("/vendor/bin/myftm", "bex_wifi_tool_exec"),
+    ("/vendor/bin/ping", "bex_wifi_tool_exec"),
     ("/vendor/bin/wlx", None),
 ])
 def test_files_are_labelled(path, label):
