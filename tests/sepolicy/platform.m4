@@ -101,6 +101,7 @@ type vendor_file, vendor_file_type, file_type;
 type vendor_shell_exec, exec_type, vendor_file_type, file_type;
 type vendor_toolbox_exec, exec_type, vendor_file_type, file_type;
 type hwservicemanager_prop, property_type;
+type vendor_default_prop, property_type;
 type hidl_base_hwservice, hwservice_manager_type;
 
 # What "protected" keeps out: the untrusted apps and nobody else.

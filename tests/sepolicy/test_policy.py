@@ -40,10 +40,15 @@ def test_it_compiles(compile_policy):
     assert compiled.returncode == 0, compiled.stderr
 
 
-def test_a_factory_test_client_may_call(compile_policy):
-    compiled = compile_policy("type my_factory_test, domain;\n"
-                              "typeattribute my_factory_test bex_wifi_client;\n")
+def test_the_example_of_a_client_may_call(compile_policy):
+    document = (HERE.parents[1] / "docs/on-device.md").read_text()
+    example = re.search(r"^```te\n(.*?)^```", document, re.MULTILINE | re.DOTALL)[1]
+    compiled = compile_policy(example)
     assert compiled.returncode == 0, compiled.stderr
+    for rule in ("bex_wifi_hwservice:hwservice_manager find", "bex_wifi:binder call",
+                 "vendor_default_prop:file read"):
+        forbidden = compile_policy(f"{example}neverallow my_factory_test {rule};\n")
+        assert "neverallow" in forbidden.stderr, rule
 
 
 @pytest.mark.parametrize("rule", [
