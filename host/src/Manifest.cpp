@@ -10,11 +10,13 @@
 #include <tinyxml2.h>
 
 #include <cstdlib>
+#include <optional>
 #include <regex>
 #include <set>
 #include <vector>
 
 #include "host/src/HostRoot.h"
+#include "host/src/RegularFile.h"
 
 namespace android::hardware::host {
 namespace {
@@ -80,13 +82,14 @@ void addHal(const XMLElement* hal, const Wanted& wanted, Instances* found) {
     }
 }
 
-void addFile(const char* path, const Wanted& wanted, Instances* found) {
+void addFile(const std::string& path, const Wanted& wanted, Instances* found) {
+    const std::optional<std::string> content = readRegularFile(path);
+    if (!content) return;
     tinyxml2::XMLDocument document;
-    const tinyxml2::XMLError error = document.LoadFile(path);
-    if (error == tinyxml2::XML_ERROR_FILE_NOT_FOUND) return;
+    const tinyxml2::XMLError error = document.Parse(content->data(), content->size());
     const XMLElement* manifest = document.FirstChildElement("manifest");
     if (error != tinyxml2::XML_SUCCESS || manifest == nullptr) {
-        ALOGE("%s is not a manifest and is ignored", path);
+        ALOGE("%s is not a manifest and is ignored", path.c_str());
         return;
     }
     for (auto* hal : children(manifest, "hal")) addHal(hal, wanted, found);
@@ -102,7 +105,7 @@ std::set<std::string> instancesInManifest(const std::string& descriptor) {
 
     Instances found;
     const std::string folder = hostRoot() + "/vendor/etc/vintf/";
-    addFile((folder + "manifest.xml").c_str(), wanted, &found);
+    addFile(folder + "manifest.xml", wanted, &found);
     glob_t fragments = {};
     if (glob((folder + "manifest/*.xml").c_str(), 0, nullptr, &fragments) == 0) {
         for (size_t i = 0; i < fragments.gl_pathc; ++i) {

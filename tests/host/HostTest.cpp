@@ -17,7 +17,7 @@
 namespace vendor::korvan::bex::wifi::tests {
 namespace {
 
-constexpr int kPatienceMs = 20'000;
+constexpr int kPatienceMs = 60'000;
 // The exit code of tests/sanitizers.
 constexpr int kSanitizerReport = 66;
 

@@ -1,9 +1,11 @@
 // Copyright 2026 The BEX Wi-Fi Authors
 // SPDX-License-Identifier: Apache-2.0
 
-// What a process knows before main().
+// What a process knows before main(), and what it is kept from inheriting.
 
 #include <android/log.h>
+#include <signal.h>
+#include <sys/stat.h>
 
 #include "tests/host/HostTest.h"
 
@@ -37,6 +39,44 @@ TEST_F(PropertiesTest, NoFileIsFine) {
     ServerProcess process({"property", "ro.board.platform", "log-level"});
     EXPECT_EQ(process.report(), "(unset)");
     EXPECT_EQ(process.report(), std::to_string(ANDROID_LOG_DEFAULT));
+    EXPECT_EQ(process.end(), 0);
+}
+
+// Opening one waits for a writer, which a deadline in main() could not end.
+TEST_F(PropertiesTest, FileThatIsNoRegularOneIsIgnored) {
+    write("vendor/etc/folders", "");
+    const std::string file = root() + "/vendor/build.prop";
+    ASSERT_EQ(mkfifo(file.c_str(), 0600), 0);
+    ServerProcess fifo({"property", "ro.board.platform"});
+    EXPECT_EQ(fifo.report(), "(unset)");
+
+    ASSERT_EQ(unlink(file.c_str()), 0);
+    ASSERT_EQ(mkdir(file.c_str(), 0700), 0);
+    ServerProcess folder({"property", "ro.board.platform"});
+    EXPECT_EQ(folder.report(), "(unset)");
+
+    ASSERT_EQ(rmdir(file.c_str()), 0);
+    ASSERT_EQ(symlink("/dev/zero", file.c_str()), 0);
+    ServerProcess endless({"property", "ro.board.platform"});
+    EXPECT_EQ(endless.report(), "(unset)");
+}
+
+class InheritedTest : public HostTest {};
+
+// With it, pclose() could not tell how a command ended.
+TEST_F(InheritedTest, IgnoredChildrensDeathsAreNotInherited) {
+    const auto before = signal(SIGCHLD, SIG_IGN);
+    ServerProcess process({"shell", "echo out; exit 3"});
+    signal(SIGCHLD, before);
+    EXPECT_EQ(process.report(), std::to_string(3 << 8) + " out");
+}
+
+TEST_F(InheritedTest, LogThatNobodyReadsEndsNothing) {
+    ServerProcess process({"unread-log", "log", "one", "log", "two", "shell",
+                           "kill -PIPE $$; echo survived", "ready"});
+    // A tool still ends as it is used to.
+    EXPECT_EQ(process.report(), std::to_string(SIGPIPE) + " ");
+    EXPECT_EQ(process.report(), "ready");
     EXPECT_EQ(process.end(), 0);
 }
 

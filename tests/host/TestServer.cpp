@@ -5,12 +5,14 @@
 
 #include <android-base/properties.h>
 #include <android/log.h>
+#include <fcntl.h>
 #include <hidl/HidlTransportSupport.h>
 #include <signal.h>
 #include <stdio.h>
 #include <stdlib.h>
 #include <sys/prctl.h>
 #include <sys/resource.h>
+#include <unistd.h>
 
 #include <cstring>
 #include <string>
@@ -34,6 +36,9 @@ int usage() {
             "  register-new NAME  an object of its own, whose tag is one more\n"
             "  property KEY       reports its value\n"
             "  log-level          reports liblog's least priority\n"
+            "  unread-log         has the log go into a pipe that nobody reads any more\n"
+            "  log TEXT           logs it as an error\n"
+            "  shell LINE         runs it; reports pclose()'s result and a line of output\n"
             "  call SCRIPT        getService()->RunRxStop(SCRIPT) as a client; reports its result\n"
             "  ready              reports \"ready\"\n"
             "  gate               waits for the gate\n"
@@ -47,6 +52,22 @@ std::string callAsClient(const char* script) {
     std::string result;
     auto called = service->RunRxStop(script, [&](const auto& out) { result = out; });
     return called.isOk() ? result : called.description();
+}
+
+void logIntoUnreadPipe() {
+    int ends[2];
+    if (pipe2(ends, O_CLOEXEC) != 0 || dup2(ends[1], STDERR_FILENO) != STDERR_FILENO) abort();
+    close(ends[0]);
+    close(ends[1]);
+}
+
+std::string runInShell(const char* line) {
+    FILE* stream = popen(line, "re");
+    char output[256] = "";
+    if (stream == nullptr) return "no shell";
+    if (fgets(output, sizeof(output), stream) == nullptr) output[0] = '\0';
+    output[strcspn(output, "\n")] = '\0';
+    return std::to_string(pclose(stream)) + " " + output;
 }
 
 } // namespace
@@ -71,6 +92,8 @@ int main(int argc, char** argv) {
             service->passGate();
         } else if (step == "log-level") {
             service->report(std::to_string(__android_log_get_minimum_priority()));
+        } else if (step == "unread-log") {
+            logIntoUnreadPipe();
         } else if (++i == argc) { // NOLINT(bugprone-branch-clone): the last one takes the rest
             return usage();
         } else if (step == "descriptors") {
@@ -86,6 +109,10 @@ int main(int argc, char** argv) {
             service->report(std::to_string(another->registerAsService(argv[i])));
         } else if (step == "property") {
             service->report(android::base::GetProperty(argv[i], "(unset)"));
+        } else if (step == "log") {
+            __android_log_write(ANDROID_LOG_ERROR, "hidl-test-server", argv[i]);
+        } else if (step == "shell") {
+            service->report(runInShell(argv[i]));
         } else if (step == "call") {
             service->report(callAsClient(argv[i]));
         } else {
