@@ -3,22 +3,49 @@
 
 #pragma once
 
-#include <optional>
 #include <string>
+#include <vector>
 
 namespace vendor::korvan::bex::wifi {
 
-/** The chips that are driven in one way. */
-enum class ChipFamily { brcm, wcn, qca, qca639x, wcn685x, wcn6750, wcn39xx };
+/** How a family's driver is stored on a phone (chips/ModuleFiles.h). */
+enum class DriverModules { none, oneOfSeveral, allOfAFolder };
+
+/** A file of the driver that the commands read or write, or that the driver loads. */
+struct DriverFile {
+    const char* path;
+    /** The module whose presence brings the file; empty for a file that is always there. */
+    const char* module;
+    /** Whether that module is unloaded at times, so that the absence of both is no fault. */
+    bool comesAndGoes;
+};
+
+/** The chips that are driven in one way: how they are recognised, what their phones must have. */
+struct ChipFamily {
+    /** Short and unique: "qca639x". Also the name of the simulated phone. */
+    const char* name;
+    /** The chip's vendor, exactly, and a part of the chip's name. An empty part is in every name.
+     */
+    const char* vendor;
+    const char* partOfName;
+    DriverModules modules;
+    /** Tools that the command lines call as /vendor/bin/NAME. */
+    std::vector<const char*> toolsByPath;
+    /** Tools that the command lines call by their bare name, which the shell looks up. */
+    std::vector<const char*> toolsByName;
+    std::vector<DriverFile> files;
+};
+
+/** All families, in the order of recognition. */
+const std::vector<ChipFamily>& chipFamilies();
 
 /**
- * Tells which family a phone's chip belongs to.
+ * The family of a phone's chip: the first of chipFamilies() that fits. Upper and lower case differ.
  *
- * @param vendor The chip's vendor: exactly "broadcom" or "qcom".
- * @param chip The chip's name. It tells the families of a vendor apart by a part of it, upper and
- *     lower case being different; any name, an empty one too, belongs to one.
- * @return Nothing when the vendor is unknown.
+ * @param vendor The phone's property ro.hardware.wlan.vendor.
+ * @param chip The phone's property ro.hardware.wlan.chip.
+ * @return The family, which lives for the whole process; null when the vendor is unknown.
  */
-std::optional<ChipFamily> chipFamily(const std::string& vendor, const std::string& chip);
+const ChipFamily* findChipFamily(const std::string& vendor, const std::string& chip);
 
 } // namespace vendor::korvan::bex::wifi

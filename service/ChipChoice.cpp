@@ -3,6 +3,8 @@
 
 #include "service/ChipChoice.h"
 
+#include <string_view>
+
 #include "chips/ChipFamily.h"
 #include "sniffer/Qca639xSnifferTool.h"
 #include "sniffer/Wcn685xSnifferTool.h"
@@ -28,28 +30,29 @@ SnifferTool* sniffer() {
 }
 
 struct FamilyChoice {
-    ChipFamily family;
+    std::string_view family;
     ChipChoice choice;
 };
 
 // clang-format off
 constexpr FamilyChoice kChoices[] = {
-    {ChipFamily::brcm,    {suit<BrcmTestSuit>,    sniffer<SnifferTool>}},
-    {ChipFamily::wcn,     {suit<WcnTestSuit>,     sniffer<SnifferTool>}},
-    {ChipFamily::qca,     {suit<QcaTestSuit>,     sniffer<SnifferTool>}},
-    {ChipFamily::qca639x, {suit<Qca639xTestSuit>, sniffer<Qca639xSnifferTool>}},
-    {ChipFamily::wcn685x, {suit<Qca639xTestSuit>, sniffer<Wcn685xSnifferTool>}},
-    {ChipFamily::wcn6750, {suit<Wcn6750TestSuit>, sniffer<Wcn685xSnifferTool>}},
-    {ChipFamily::wcn39xx, {suit<Wcn39xxTestSuit>, sniffer<SnifferTool>}},
+    {"broadcom", {suit<BrcmTestSuit>,    sniffer<SnifferTool>}},
+    {"wcn",      {suit<WcnTestSuit>,     sniffer<SnifferTool>}},
+    {"qca",      {suit<QcaTestSuit>,     sniffer<SnifferTool>}},
+    {"qca639x",  {suit<Qca639xTestSuit>, sniffer<Qca639xSnifferTool>}},
+    {"wcn685x",  {suit<Qca639xTestSuit>, sniffer<Wcn685xSnifferTool>}},
+    {"wcn6750",  {suit<Wcn6750TestSuit>, sniffer<Wcn685xSnifferTool>}},
+    {"wcn39xx",  {suit<Wcn39xxTestSuit>, sniffer<SnifferTool>}},
 };
 // clang-format on
 
 } // namespace
 
 const ChipChoice* chooseChip(const std::string& vendor, const std::string& chip) {
-    const std::optional<ChipFamily> family = chipFamily(vendor, chip);
+    const ChipFamily* family = findChipFamily(vendor, chip);
+    if (family == nullptr) return nullptr;
     for (const FamilyChoice& row : kChoices) {
-        if (row.family == family) return &row.choice;
+        if (row.family == family->name) return &row.choice;
     }
     return nullptr;
 }

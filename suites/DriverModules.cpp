@@ -7,10 +7,12 @@
 #include <dirent.h>
 #include <unistd.h>
 
+#include "chips/ModuleFiles.h"
+
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 int findFwPath(const char* tag, std::string* fwPath) {
-    for (const char* candidate : kFwPathCandidates) {
+    for (const char* candidate : kModuleCandidates) {
         if (access(candidate, R_OK) == 0) {
             *fwPath = candidate;
             return 0;
@@ -21,13 +23,13 @@ int findFwPath(const char* tag, std::string* fwPath) {
 }
 
 int listDriverPaths(const char* tag, std::vector<std::string>* driverPaths) {
-    DIR* directory = opendir(kDriverDir);
+    DIR* directory = opendir(kModuleFolder);
     if (directory == nullptr) return -1;
     while (const dirent* entry = readdir(directory)) {
         const std::string name = entry->d_name;
-        if (name.rfind(kDriverPrefix, 0) != 0) continue;
+        if (name.rfind(kModulePrefix, 0) != 0) continue;
         __android_log_print(ANDROID_LOG_ERROR, tag, "getDriverPaths: %s", name.c_str());
-        driverPaths->push_back(std::string(kDriverDir) + "/" + name);
+        driverPaths->push_back(std::string(kModuleFolder) + "/" + name);
     }
     closedir(directory);
     return driverPaths->empty() ? -1 : 0;

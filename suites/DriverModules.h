@@ -8,23 +8,10 @@
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
-// Where the phone keeps the WLAN driver's kernel module.
-
-/** The places of the one module file of a driver, in the order of the search. */
-inline constexpr const char* kFwPathCandidates[] = {
-        "/system/lib/modules/wlan.ko",
-        "/vendor/lib/modules/wlan.ko",
-        "/system/lib/modules/qca_cld3_wlan.ko",
-        "/vendor/lib/modules/qca_cld3_wlan.ko",
-        "/vendor/lib/modules/qca_cld3/qca_cld3_wlan.ko",
-};
-
-/** The module directory of a driver of several files, and how their names begin. */
-inline constexpr const char* kDriverDir = "/vendor/lib/modules";
-inline constexpr const char* kDriverPrefix = "qca_cld3_";
+// The search for the kernel module files of the WLAN driver (chips/ModuleFiles.h).
 
 /**
- * Looks for the one module file of the driver in kFwPathCandidates, and takes the first that can
+ * Looks for the one module file of the driver in kModuleCandidates, and takes the first that can
  * be read.
  *
  * @param tag The log tag of the caller.
@@ -34,8 +21,8 @@ inline constexpr const char* kDriverPrefix = "qca_cld3_";
 int findFwPath(const char* tag, std::string* fwPath);
 
 /**
- * Adds every file in kDriverDir whose name begins with kDriverPrefix, with an error line for each,
- * in the order in which the directory lists them.
+ * Adds every file in kModuleFolder whose name begins with kModulePrefix, with an error line for
+ * each, in the order in which the directory lists them.
  *
  * @param tag The log tag of the caller.
  * @param driverPaths Gets the paths, behind those that it has.

@@ -20,7 +20,7 @@ void append(Checks more, Checks* checks) {
 
 Checks examine(const FindService& tryFind, const PhoneView& phone,
                std::chrono::nanoseconds timeout) {
-    const std::optional<ChipFamily> family = phoneFamily();
+    const ChipFamily* family = phoneFamily();
     Checks checks = checkProperties(family);
     append(checkService(tryFind, phone, timeout), &checks);
     append(checkTools(phone.root, family), &checks);

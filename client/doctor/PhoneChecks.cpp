@@ -9,11 +9,11 @@
 #include <cctype>
 #include <cstring>
 #include <iterator>
+#include <optional>
 
+#include "chips/ModuleFiles.h"
 #include "client/base/Json.h"
-#include "client/doctor/DoctorNeeds.h"
 #include "client/doctor/PhoneFiles.h"
-#include "suites/DriverModules.h"
 
 namespace vendor::korvan::bex::wifi::client {
 namespace {
@@ -21,9 +21,6 @@ namespace {
 using ::android::base::GetProperty;
 using ::android::base::Join;
 using ::android::base::StartsWith;
-using V1_0::implementation::kDriverDir;
-using V1_0::implementation::kDriverPrefix;
-using V1_0::implementation::kFwPathCandidates;
 
 constexpr char kVendor[] = "ro.hardware.wlan.vendor";
 constexpr char kChip[] = "ro.hardware.wlan.chip";
@@ -37,8 +34,8 @@ constexpr char kInsmodDenied[] =
         "; when insmod is refused, the service lacks the capability sys_module, or \"module_load\" "
         "for the file's label: logcat | grep avc";
 
-// Where the service's shell looks for a bare name, as the init script says. What lies outside of the
-// first ones a vendor process may not execute, unless its policy makes an exception.
+// Where the service's shell looks for a bare name, as the init script says. What lies outside of
+// the first ones a vendor process may not execute, unless its policy makes an exception.
 constexpr const char* kVendorFolders[] = {"/vendor/bin/", "/vendor/xbin/", "/odm/bin/"};
 constexpr const char* kOtherFolders[] = {"/system/bin/", "/system/xbin/"};
 
@@ -51,25 +48,38 @@ Check notExecutable(const std::string& name, const std::string& path) {
                    "install it with mode 755: chmod 755 " + path);
 }
 
+/** The vendors that the service knows: "broadcom or qcom". */
+std::string vendors() {
+    std::string all;
+    std::string last;
+    for (const ChipFamily& family : chipFamilies()) {
+        if (last == family.vendor) continue;
+        last = family.vendor;
+        all += (all.empty() ? "" : " or ") + last;
+    }
+    return all;
+}
+
 Check checkVendorProperty(bool known) {
     const std::string vendor = GetProperty(kVendor, "");
     if (known) return ok("vendor", std::string(kVendor) + " is " + vendor);
     const std::string found =
             std::string(kVendor) + (vendor.empty() ? " is not set" : " is " + jsonString(vendor));
     return problem("vendor", found + ": the first call ends the service",
-                   "set it to broadcom or qcom in vendor/build.prop, and reboot");
+                   "set it to " + vendors() + " in vendor/build.prop, and reboot");
 }
 
-Check checkChipProperty(std::optional<ChipFamily> family) {
+Check checkChipProperty(const ChipFamily* family) {
     const std::string chip = GetProperty(kChip, "");
-    const std::string taken = family ? std::string("taken for the family ") + needsOf(*family).name
-                                     : "of no known vendor";
+    const std::string taken = family != nullptr
+                                      ? std::string("taken for the family ") + family->name
+                                      : "of no known vendor";
     if (chip.empty()) {
         return problem("chip", std::string(kChip) + " is not set: " + taken,
                        "set it to the chip's name in vendor/build.prop, and reboot");
     }
     const std::string found = std::string(kChip) + " is " + jsonString(chip) + ": " + taken;
-    return family ? ok("chip", found) : unknown("chip", found, "mend \"vendor\" first");
+    return family != nullptr ? ok("chip", found) : unknown("chip", found, "mend \"vendor\" first");
 }
 
 Check checkMimoProperty() {
@@ -128,8 +138,8 @@ Check checkName(const std::string& root, const std::string& tool) {
 }
 
 Check checkModuleCandidates(const std::string& root) {
-    const std::vector<const char*> places(std::begin(kFwPathCandidates),
-                                          std::end(kFwPathCandidates));
+    const std::vector<const char*> places(std::begin(kModuleCandidates),
+                                          std::end(kModuleCandidates));
     std::optional<Check> hidden;
     for (const char* candidate : places) {
         const FileState state = look(root + candidate);
@@ -143,16 +153,15 @@ Check checkModuleCandidates(const std::string& root) {
 }
 
 Check checkModuleFolder(const std::string& root) {
-    const Folder folder = listFolder(root + kDriverDir);
-    if (folder.hidden()) return unseen("module", kDriverDir, {folder.error, 0, 0});
+    const Folder folder = listFolder(root + kModuleFolder);
+    if (folder.hidden()) return unseen("module", kModuleFolder, {folder.error, 0, 0});
     std::vector<std::string> modules;
     for (const std::string& name : folder.names) {
-        if (StartsWith(name, kDriverPrefix)) modules.push_back(name);
+        if (StartsWith(name, kModulePrefix)) modules.push_back(name);
     }
-    if (!modules.empty()) {
-        return ok("module", std::string(kDriverDir) + ": " + Join(modules, ", "));
-    }
-    return problem("module", std::string("no ") + kDriverPrefix + "* in " + kDriverDir,
+    if (!modules.empty())
+        return ok("module", std::string(kModuleFolder) + ": " + Join(modules, ", "));
+    return problem("module", std::string("no ") + kModulePrefix + "* in " + kModuleFolder,
                    "install the driver's modules there and restart the service, which looks for "
                    "them once");
 }
@@ -208,38 +217,38 @@ std::string debugHiddenBy(const std::string& tag) {
 
 } // namespace
 
-std::optional<ChipFamily> phoneFamily() {
-    return chipFamily(GetProperty(kVendor, ""), GetProperty(kChip, ""));
+const std::vector<std::string> kCommandTags = {"wifi@1.0-VendorTestSuit", "wifi@1.0-SnifferTool"};
+
+const ChipFamily* phoneFamily() {
+    return findChipFamily(GetProperty(kVendor, ""), GetProperty(kChip, ""));
 }
 
-Checks checkProperties(std::optional<ChipFamily> family) {
-    return {checkVendorProperty(family.has_value()), checkChipProperty(family),
-            checkMimoProperty()};
+Checks checkProperties(const ChipFamily* family) {
+    return {checkVendorProperty(family != nullptr), checkChipProperty(family), checkMimoProperty()};
 }
 
-Checks checkTools(const std::string& root, std::optional<ChipFamily> family) {
+Checks checkTools(const std::string& root, const ChipFamily* family) {
     Checks checks = {checkShell(root)};
-    if (!family) {
+    if (family == nullptr) {
         checks.push_back(
                 unknown("tools", "which ones depends on the chip", "mend \"vendor\" first"));
         return checks;
     }
-    const FamilyNeeds& needs = needsOf(*family);
-    for (const char* tool : needs.byPath)
+    for (const char* tool : family->toolsByPath)
         checks.push_back(checkPath(root, kVendorBin + std::string(tool)));
-    for (const char* tool : needs.byName) checks.push_back(checkName(root, tool));
+    for (const char* tool : family->toolsByName) checks.push_back(checkName(root, tool));
     return checks;
 }
 
-Checks checkDriver(const std::string& root, std::optional<ChipFamily> family) {
-    if (!family) {
+Checks checkDriver(const std::string& root, const ChipFamily* family) {
+    if (family == nullptr) {
         return {unknown("driver", "its files depend on the chip", "mend \"vendor\" first")};
     }
-    const FamilyNeeds& needs = needsOf(*family);
     Checks checks;
-    if (needs.modules == Modules::oneOfSeveral) checks.push_back(checkModuleCandidates(root));
-    if (needs.modules == Modules::allOfAFolder) checks.push_back(checkModuleFolder(root));
-    for (const DriverFile& file : needs.files) {
+    if (family->modules == DriverModules::oneOfSeveral)
+        checks.push_back(checkModuleCandidates(root));
+    if (family->modules == DriverModules::allOfAFolder) checks.push_back(checkModuleFolder(root));
+    for (const DriverFile& file : family->files) {
         const bool always = *file.module == '\0';
         checks.push_back(always ? checkImage(root, file.path) : checkParameter(root, file));
     }

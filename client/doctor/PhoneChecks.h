@@ -3,31 +3,34 @@
 
 #pragma once
 
-#include <optional>
 #include <string>
+#include <vector>
 
 #include "chips/ChipFamily.h"
 #include "client/doctor/Check.h"
 
 // What the service's command lines need: each function makes the checks of one kind. A family is
-// missing when the phone names no known vendor.
+// null when the phone names no known vendor.
 
 namespace vendor::korvan::bex::wifi::client {
 
-/** The family that the phone's properties name. */
-std::optional<ChipFamily> phoneFamily();
+/** The tags under which the service logs its command lines, at the priority DEBUG. */
+extern const std::vector<std::string> kCommandTags;
 
-Checks checkProperties(std::optional<ChipFamily> family);
+/** The family that the phone's properties name. */
+const ChipFamily* phoneFamily();
+
+Checks checkProperties(const ChipFamily* family);
 
 /**
  * The shell and the tools.
  *
  * @param root As in PhoneView.
  */
-Checks checkTools(const std::string& root, std::optional<ChipFamily> family);
+Checks checkTools(const std::string& root, const ChipFamily* family);
 
 /** Module files, firmware images and the driver's parameters. */
-Checks checkDriver(const std::string& root, std::optional<ChipFamily> family);
+Checks checkDriver(const std::string& root, const ChipFamily* family);
 
 /** Whether the log shows which commands the service runs. */
 Check checkCommandLog();

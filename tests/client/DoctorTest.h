@@ -13,8 +13,8 @@
 #include <fstream>
 
 #include "FakeService.h"
+#include "chips/ChipFamily.h"
 #include "client/doctor/Doctor.h"
-#include "client/doctor/DoctorNeeds.h"
 
 namespace vendor::korvan::bex::wifi::client {
 
@@ -76,7 +76,7 @@ inline constexpr char kFragment[] = "/vendor/etc/vintf/manifest/wifi.xml";
 /** Each test begins with a healthy Broadcom phone, and breaks something. */
 class DoctorTest : public ::testing::Test {
   protected:
-    DoctorTest() { install("broadcom", "bcm4375", ChipFamily::brcm); }
+    DoctorTest() { install("broadcom", "bcm4375"); }
 
     ~DoctorTest() override {
         for (const std::string& name : mProperties) ::android::base::SetProperty(name, "");
@@ -87,20 +87,24 @@ class DoctorTest : public ::testing::Test {
         ::android::base::SetProperty(property, value);
     }
 
-    /** Makes the phone one of another family. */
-    void install(const std::string& vendor, const std::string& chip, ChipFamily family) {
+    /** Makes the phone one with another chip. */
+    void install(const std::string& vendor, const std::string& chip) {
         std::filesystem::remove_all(mRoot.path);
         set("ro.hardware.wlan.vendor", vendor);
         set("ro.hardware.wlan.chip", chip);
         write(kFragment, kEntry);
         writeTool("/vendor/bin/sh");
-        const FamilyNeeds& needs = needsOf(family);
-        for (const auto* tools : {&needs.byPath, &needs.byName}) {
+        const ChipFamily& family = *findChipFamily(vendor, chip);
+        for (const auto* tools : {&family.toolsByPath, &family.toolsByName}) {
             for (const char* tool : *tools) writeTool(std::string("/vendor/bin/") + tool);
         }
-        for (const DriverFile& file : needs.files) write(file.path, "0");
-        if (needs.modules == Modules::oneOfSeveral) write("/vendor/lib/modules/wlan.ko", "x");
-        if (needs.modules == Modules::allOfAFolder) write("/vendor/lib/modules/qca_cld3_x", "x");
+        for (const DriverFile& file : family.files) write(file.path, "0");
+        if (family.modules == DriverModules::oneOfSeveral) {
+            write("/vendor/lib/modules/wlan.ko", "x");
+        }
+        if (family.modules == DriverModules::allOfAFolder) {
+            write("/vendor/lib/modules/qca_cld3_x", "x");
+        }
     }
 
     void write(const std::string& path, const std::string& text) {

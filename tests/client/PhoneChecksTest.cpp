@@ -62,7 +62,7 @@ TEST_F(PhoneChecksTest, AToolThatTheShellLooksUp) {
 }
 
 TEST_F(PhoneChecksTest, TheOneModuleFile) {
-    install("qcom", "QCA6174", ChipFamily::qca);
+    install("qcom", "QCA6174");
     expectOk("module", "/vendor/lib/modules/wlan.ko");
     mode("/vendor/lib/modules/wlan.ko", 0);
     expectOnly("module", "none can be read", "restart the service");
@@ -73,7 +73,7 @@ TEST_F(PhoneChecksTest, TheOneModuleFile) {
 }
 
 TEST_F(PhoneChecksTest, TheFolderOfModules) {
-    install("qcom", "wcn6750", ChipFamily::wcn6750);
+    install("qcom", "wcn6750");
     write("/vendor/lib/modules/qca_cld3_y.ko", "");
     write("/vendor/lib/modules/rmnet.ko", "");
     expectOk("module", "/vendor/lib/modules: qca_cld3_x, qca_cld3_y.ko");

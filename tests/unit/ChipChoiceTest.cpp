@@ -4,6 +4,7 @@
 #include <memory>
 #include <typeinfo>
 
+#include "chips/ChipFamily.h"
 #include "service/ChipChoice.h"
 #include "sniffer/Qca639xSnifferTool.h"
 #include "sniffer/Wcn685xSnifferTool.h"
@@ -46,6 +47,15 @@ TEST(ChipChoiceTest, EveryFamilyGetsItsSuitAndItsSniffer) {
         {"qcom",     "qca639X",   typeid(Wcn39xxTestSuit), typeid(SnifferTool)},
         {"qcom",     "39x",       typeid(Wcn39xxTestSuit), typeid(SnifferTool)},
         {"qcom",     "bcm4375",   typeid(Wcn39xxTestSuit), typeid(SnifferTool)},
+        // A part of a part is not enough.
+        {"qcom",     "CN3990",    typeid(Wcn39xxTestSuit), typeid(SnifferTool)},
+        {"qcom",     "QC6174",    typeid(Wcn39xxTestSuit), typeid(SnifferTool)},
+        {"qcom",     "CA6174",    typeid(Wcn39xxTestSuit), typeid(SnifferTool)},
+        {"qcom",     "qca639",    typeid(Wcn39xxTestSuit), typeid(SnifferTool)},
+        {"qcom",     "wcn685",    typeid(Wcn39xxTestSuit), typeid(SnifferTool)},
+        {"qcom",     "wcn85x",    typeid(Wcn39xxTestSuit), typeid(SnifferTool)},
+        {"qcom",     "wcn675",    typeid(Wcn39xxTestSuit), typeid(SnifferTool)},
+        {"qcom",     "wcn750",    typeid(Wcn39xxTestSuit), typeid(SnifferTool)},
     };
     const RecordedShell shell;
     for (const auto& [vendor, chip, suitType, snifferType] : cases) {
@@ -62,8 +72,16 @@ TEST(ChipChoiceTest, EveryFamilyGetsItsSuitAndItsSniffer) {
 
 // clang-format on
 
+TEST(ChipChoiceTest, EveryFamilyHasARow) {
+    for (const ChipFamily& family : chipFamilies()) {
+        EXPECT_EQ(&family, findChipFamily(family.vendor, family.partOfName)) << family.name;
+        EXPECT_NE(nullptr, chooseChip(family.vendor, family.partOfName)) << family.name;
+    }
+}
+
 TEST(ChipChoiceTest, UnknownVendorsGetNothing) {
-    for (const char* vendor : {"", "Broadcom", "broadcom ", "qcom ", "Qcom", "qco", "other"}) {
+    for (const char* vendor : {"", "Broadcom", "broadcom ", "broadco", "roadcom", "qcom ", "Qcom",
+                               "qco", "com", "other"}) {
         EXPECT_EQ(nullptr, chooseChip(vendor, "WCN3990")) << vendor;
     }
 }

@@ -64,7 +64,7 @@ DISAGREEMENTS = [
     (RC, "    class hal", "    interface android.hidl.base@1.0::IBase default\n    class hal",
      "is not the service's own interface"),
     (SANDBOX, "/vendor/bin:/vendor/xbin", "/vendor/xbin:/vendor/bin", "PATH is not '/vendor/bin:"),
-    ("client/PhoneChecks.cpp", 'Folders[] = {"/vendor/bin/"', 'Folders[] = {"/odm/bin/"',
+    ("client/doctor/PhoneChecks.cpp", 'Folders[] = {"/vendor/bin/"', 'Folders[] = {"/odm/bin/"',
      "the folders are not '/vendor/bin:"),
     (XML, "<name>vendor.korvan.bex.wifi<", "<name>vendor.korvan.wifi<", "not 'vendor.korvan.bex.wifi'"),
     (XML, "<version>1.0<", "<version>1.1<", "version is '1.1', not '1.0'"),

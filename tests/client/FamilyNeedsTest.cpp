@@ -1,7 +1,7 @@
 // Copyright 2026 The BEX Wi-Fi Authors
 // SPDX-License-Identifier: Apache-2.0
 
-// What the doctor looks for is what the command lines of all operations use.
+// What a family needs of its phones is what the command lines of all operations use.
 
 #include <android-base/properties.h>
 #include <gmock/gmock.h>
@@ -11,8 +11,9 @@
 #include <set>
 #include <sstream>
 
+#include "chips/ChipFamily.h"
 #include "client/Commands.h"
-#include "client/doctor/DoctorNeeds.h"
+#include "client/doctor/PhoneChecks.h"
 #include "recorder/RecordedShell.h"
 #include "service/WifiService.h"
 
@@ -23,31 +24,14 @@ using ::android::sp;
 using ::android::base::SetProperty;
 using Words = std::set<std::string>;
 
-struct Phone {
-    const char* vendor;
-    const char* chip;
-    ChipFamily family;
-};
-
-std::ostream& operator<<(std::ostream& out, const Phone& phone) {
-    return out << phone.vendor << ' ' << phone.chip;
-}
-
-constexpr Phone kPhones[] = {
-        {"broadcom", "bcm4375", ChipFamily::brcm}, {"qcom", "WCN3990", ChipFamily::wcn},
-        {"qcom", "QCA6174", ChipFamily::qca},      {"qcom", "qca639x", ChipFamily::qca639x},
-        {"qcom", "wcn685x", ChipFamily::wcn685x},  {"qcom", "wcn6750", ChipFamily::wcn6750},
-        {"qcom", "wcn3950", ChipFamily::wcn39xx},
-};
-
 constexpr char kModule[] = "/vendor/lib/modules/wlan.ko";
 constexpr char kModules[] = "/vendor/lib/modules/qca_cld3_x.ko";
 
-class DoctorNeedsTest : public ::testing::TestWithParam<Phone> {
+class FamilyNeedsTest : public ::testing::TestWithParam<ChipFamily> {
   protected:
-    DoctorNeedsTest() {
+    FamilyNeedsTest() {
         SetProperty("ro.hardware.wlan.vendor", GetParam().vendor);
-        SetProperty("ro.hardware.wlan.chip", GetParam().chip);
+        SetProperty("ro.hardware.wlan.chip", GetParam().partOfName);
         mShell.readable(kModule);
         mShell.directory("/vendor/lib/modules", {"qca_cld3_x.ko"});
         const sp<IWifiService> service = new V1_0::implementation::WifiService();
@@ -61,7 +45,7 @@ class DoctorNeedsTest : public ::testing::TestWithParam<Phone> {
         }
     }
 
-    ~DoctorNeedsTest() override {
+    ~FamilyNeedsTest() override {
         SetProperty("ro.hardware.wlan.vendor", "");
         SetProperty("ro.hardware.wlan.chip", "");
     }
@@ -91,20 +75,20 @@ class DoctorNeedsTest : public ::testing::TestWithParam<Phone> {
         return found;
     }
 
-    const FamilyNeeds& mNeeds = needsOf(GetParam().family);
+    const ChipFamily& mFamily = GetParam();
     recorder::RecordedShell mShell;
 };
 
-TEST_P(DoctorNeedsTest, TheTools) {
-    Words named(mNeeds.byName.begin(), mNeeds.byName.end());
-    for (const char* tool : mNeeds.byPath) named.insert(std::string("/vendor/bin/") + tool);
+TEST_P(FamilyNeedsTest, TheTools) {
+    Words named(mFamily.toolsByName.begin(), mFamily.toolsByName.end());
+    for (const char* tool : mFamily.toolsByPath) named.insert(std::string("/vendor/bin/") + tool);
     EXPECT_EQ(named, tools());
-    EXPECT_EQ(named.size(), mNeeds.byName.size() + mNeeds.byPath.size());
+    EXPECT_EQ(named.size(), mFamily.toolsByName.size() + mFamily.toolsByPath.size());
 }
 
-TEST_P(DoctorNeedsTest, TheDriversFiles) {
+TEST_P(FamilyNeedsTest, TheDriversFiles) {
     Words named;
-    for (const DriverFile& file : mNeeds.files) {
+    for (const DriverFile& file : mFamily.files) {
         named.insert(file.path);
         const std::string module = std::string("/sys/module/") + file.module + "/";
         EXPECT_EQ(*file.module != '\0', std::string(file.path).rfind(module, 0) == 0) << file.path;
@@ -112,22 +96,22 @@ TEST_P(DoctorNeedsTest, TheDriversFiles) {
     EXPECT_EQ(named, matches("/(sys|etc)/[^ \"]*"));
 }
 
-TEST_P(DoctorNeedsTest, TheModules) {
+TEST_P(FamilyNeedsTest, TheModules) {
     const Words loaded = matches("/[^ ]*\\.ko");
-    switch (mNeeds.modules) {
-        case Modules::none:
+    switch (mFamily.modules) {
+        case DriverModules::none:
             EXPECT_EQ(loaded, Words{});
             break;
-        case Modules::oneOfSeveral:
+        case DriverModules::oneOfSeveral:
             EXPECT_EQ(loaded, Words{kModule});
             break;
-        case Modules::allOfAFolder:
+        case DriverModules::allOfAFolder:
             EXPECT_EQ(loaded, Words{kModules});
             break;
     }
 }
 
-TEST_P(DoctorNeedsTest, TheTagsOfTheCommands) {
+TEST_P(FamilyNeedsTest, TheTagsOfTheCommands) {
     Words tags;
     for (const auto& line : mShell.log()) {
         if (line.text.rfind("cmd: ", 0) == 0) tags.insert(line.tag);
@@ -135,8 +119,8 @@ TEST_P(DoctorNeedsTest, TheTagsOfTheCommands) {
     EXPECT_EQ(tags, Words(kCommandTags.begin(), kCommandTags.end()));
 }
 
-INSTANTIATE_TEST_SUITE_P(EveryFamily, DoctorNeedsTest, ::testing::ValuesIn(kPhones),
-                         [](const auto& phone) { return needsOf(phone.param.family).name; });
+INSTANTIATE_TEST_SUITE_P(EveryFamily, FamilyNeedsTest, ::testing::ValuesIn(chipFamilies()),
+                         [](const auto& family) { return family.param.name; });
 
 } // namespace
 } // namespace vendor::korvan::bex::wifi::client
