@@ -188,6 +188,11 @@ std::vector<RecordedShell::LogLine> RecordedShell::log(const std::string& tag) c
     return lines;
 }
 
+bool RecordedShell::allClosed() const {
+    const std::lock_guard lock(gMutex);
+    return gRecording.running.empty() && gRecording.reading.empty();
+}
+
 void RecordedShell::clear() {
     const std::lock_guard lock(gMutex);
     gRecording.lines.clear();

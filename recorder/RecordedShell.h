@@ -75,6 +75,9 @@ class RecordedShell {
     /** The log lines that were written, in order. */
     std::vector<LogLine> log() const;
 
+    /** Tells whether every command has been closed by pclose and every directory by closedir. */
+    bool allClosed() const;
+
     /** The log lines of one tag, in order. */
     std::vector<LogLine> log(const std::string& tag) const;
 

@@ -58,6 +58,9 @@ TEST_F(RunListTest, GoesOnBehindAFailureAndRemembersIt) {
 TEST_F(RunListTest, ToleratesAFailureOfALineThatBeginsWithInsmod) {
     EXPECT_EQ(0, run({{"insmod", "bad"}, {"a"}}));
     EXPECT_EQ(0, run({{"insmod-bad"}}));
+    EXPECT_EQ(-1, run({{"insmo", "bad"}}));
+    EXPECT_EQ(-1, run({{"insmo-bad"}}));
+    EXPECT_EQ(-1, run({{"nsmod", "bad"}}));
     EXPECT_EQ(-1, run({{"/vendor/bin/insmod", "bad"}}));
     EXPECT_EQ(-1, run({{" insmod", "bad"}}));
     EXPECT_EQ(-1, run({{"", "insmod", "bad"}}));

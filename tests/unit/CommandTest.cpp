@@ -11,6 +11,8 @@ namespace {
 
 class CommandTest : public ::testing::Test {
   protected:
+    ~CommandTest() override { EXPECT_TRUE(mShell.allClosed()); }
+
     CommandResult run(const std::string& cmd) {
         CommandResult result{7, "left over"};
         runCommand(cmd, "tag", result);

@@ -39,6 +39,8 @@ TEST(FindFwPathTest, KeepsThePathWhenNoneIsReadable) {
 
 class ListDriverPathsTest : public ::testing::Test {
   protected:
+    ~ListDriverPathsTest() override { EXPECT_TRUE(mShell.allClosed()); }
+
     RecordedShell mShell;
     std::vector<std::string> mPaths;
 };

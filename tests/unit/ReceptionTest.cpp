@@ -45,6 +45,8 @@ TEST_F(ReceptionTest, FindsTheGoodPackets) {
         {1, "badgoodPacketsx 6",               "6",            2},
         {1, "no label here",                   "",             0},
         {1, "GoodPackets 1 2 3",               "",             0},
+        {1, "goodPacket 1 2 3",                "",             0},
+        {1, "oodPackets 1 2 3",                "",             0},
         {1, "",                                "",             0},
         {2, "goodPackets : 1234 x",            "1234",         4},
         {2, "goodPackets = 5 goodPackets = 6", "6",            3},

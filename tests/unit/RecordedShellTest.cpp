@@ -60,6 +60,20 @@ TEST(RecordedShellTest, TwoReadersDoNotDisturbEachOther) {
     closedir(first);
 }
 
+TEST(RecordedShellTest, KnowsWhatIsStillOpen) {
+    RecordedShell shell;
+    shell.directory("/vendor", {});
+    EXPECT_TRUE(shell.allClosed());
+    DIR* directory = opendir("/vendor");
+    EXPECT_FALSE(shell.allClosed());
+    closedir(directory);
+    EXPECT_TRUE(shell.allClosed());
+    FILE* command = popen("wl ver", "r");
+    EXPECT_FALSE(shell.allClosed());
+    pclose(command);
+    EXPECT_TRUE(shell.allClosed());
+}
+
 TEST(RecordedShellTest, WithoutARecordingTheFilesAreTheMachines) {
     EXPECT_EQ(0, access("/", R_OK));
     EXPECT_EQ(-1, access("/no such file", R_OK));
