@@ -22,9 +22,7 @@ constexpr const char* kLogTag = "wifi@1.0-impl";
 Return<void> answer(const char* method, int status, const std::string& out,
                     const std::function<void(const hidl_string&)>& callback) {
     if (status != 0) __android_log_print(ANDROID_LOG_ERROR, kLogTag, "function at: %s", method);
-    hidl_string text;
-    text.setToExternal(out.c_str(), out.size());
-    callback(text);
+    callback(hidl_string(out));
     return Void();
 }
 
