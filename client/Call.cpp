@@ -3,47 +3,41 @@
 
 #include "client/Call.h"
 
-#include <algorithm>
-#include <condition_variable>
+#include <atomic>
 #include <memory>
-#include <mutex>
-#include <thread>
 
 namespace vendor::korvan::bex::wifi::client {
 namespace {
 
-using Clock = std::chrono::steady_clock;
-
+/** What the worker tells of itself; the answer may be read when it is done. */
 struct Shared {
-    std::mutex lock;
-    std::condition_variable ended;
-    // Where the worker is: before its end this says how a deadline would find it.
-    Ending ending = Ending::lateFinding;
+    std::atomic<Stage> stage = Stage::lookup;
+    bool found = false;
     Answer answer;
-    bool done = false;
-
-    void end(Ending how, Answer what) {
-        const std::lock_guard<std::mutex> guard(lock);
-        ending = how;
-        answer = std::move(what);
-        done = true;
-        ended.notify_one();
-    }
 };
 
 void work(const Request& request, const FindService& find, Shared* shared) {
     const ::android::sp<IWifiService> service = find();
-    if (service == nullptr) {
-        shared->end(Ending::notFound, {});
-        return;
+    if (service == nullptr) return;
+    shared->found = true;
+    shared->stage = Stage::call;
+    shared->answer = request.command->call(*service, request.values);
+    if (shared->answer.delivered) shared->stage = Stage::done;
+}
+
+Ending endingOf(const Waited& waited, const Shared& shared) {
+    switch (waited.end) {
+        case Waited::End::late:
+            return Ending::late;
+        case Waited::End::interrupted:
+            return Ending::interrupted;
+        case Waited::End::notStarted:
+            return Ending::notStarted;
+        case Waited::End::done:
+            break;
     }
-    {
-        const std::lock_guard<std::mutex> guard(shared->lock);
-        shared->ending = Ending::lateCalling;
-    }
-    Answer answer = request.command->call(*service, request.values);
-    const Ending ending = answer.delivered ? Ending::answered : Ending::transportFailed;
-    shared->end(ending, std::move(answer));
+    if (!shared.found) return Ending::notFound;
+    return shared.answer.delivered ? Ending::answered : Ending::transportFailed;
 }
 
 } // namespace
@@ -51,31 +45,15 @@ void work(const Request& request, const FindService& find, Shared* shared) {
 Outcome callService(const Request& request, const FindService& find,
                     std::optional<std::chrono::nanoseconds> timeout, const Progress& progress) {
     const Clock::time_point start = Clock::now();
-    const Clock::time_point deadline = timeout ? start + *timeout : Clock::time_point::max();
     const auto shared = std::make_shared<Shared>();
-    std::thread worker([request, find, shared] { work(request, find, shared.get()); });
-
-    std::unique_lock<std::mutex> guard(shared->lock);
-    for (long tick = 1; !shared->done; ++tick) {
-        // Without a timeout the wait still ends at each tick: a wait for time_point::max()
-        // overflows in some C++ libraries.
-        const Clock::time_point wake = std::min(deadline, start + tick * progress.interval);
-        shared->ended.wait_until(guard, wake, [&shared] { return shared->done; });
-        if (shared->done || Clock::now() >= deadline) break;
-        if (progress.tick) {
-            guard.unlock();
-            progress.tick(tick);
-            guard.lock();
-        }
-    }
-    const bool done = shared->done;
-    Outcome outcome{shared->ending, shared->answer, Clock::now() - start};
-    guard.unlock();
-    if (done) {
-        worker.join();
-    } else {
-        worker.detach();
-    }
+    const Waited waited = waitFor([request, find, shared] { work(request, find, shared.get()); },
+                                  timeout ? start + *timeout : kNever, progress);
+    Outcome outcome;
+    outcome.ending = endingOf(waited, *shared);
+    outcome.stage = shared->stage;
+    outcome.number = waited.number;
+    if (waited.end == Waited::End::done) outcome.answer = shared->answer;
+    outcome.duration = Clock::now() - start;
     return outcome;
 }
 

@@ -4,21 +4,26 @@
 #pragma once
 
 #include <chrono>
-#include <functional>
 #include <optional>
 
 #include "client/Commands.h"
 #include "client/base/Service.h"
+#include "client/base/Worker.h"
 
-// Finding the service and calling it, with a deadline.
-//
-// Threads: neither the search nor a call can be broken off, so both run on a worker thread, and the
-// caller's thread only waits. The worker alone touches the service; the two share one state under
-// one lock, which each keeps alive. When the deadline passes, the worker is left where it is: it
-// may be inside of the platform's libraries, so the process then ends with _exit, which leaves
-// their static objects alone.
+// Finding the service and calling it, with a deadline. Both happen on one worker thread, which
+// alone touches the service (see base/Worker.h).
 
 namespace vendor::korvan::bex::wifi::client {
+
+/** How far a call has come. */
+enum class Stage {
+    /** The service has not been found: nothing was called. */
+    lookup,
+    /** The call is on its way, and has no answer. */
+    call,
+    /** The service answered. */
+    done,
+};
 
 /** How a call ended. */
 enum class Ending {
@@ -28,30 +33,26 @@ enum class Ending {
     notFound,
     /** The transaction failed: Outcome::answer tells why. */
     transportFailed,
-    /** The deadline passed before the service was found. */
-    lateFinding,
-    /** The deadline passed before the service answered. */
-    lateCalling,
+    /** The deadline passed; Outcome::stage tells where. */
+    late,
+    /** A signal came: Outcome::number. */
+    interrupted,
+    /** The process cannot start a thread: Outcome::number is the errno. */
+    notStarted,
 };
 
 struct Outcome {
     Ending ending = Ending::notFound;
+    Stage stage = Stage::lookup;
     Answer answer;
+    int number = 0;
     /** From the begin of the search to the end of the call. */
     std::chrono::nanoseconds duration{};
 };
 
-/** What happens while a call is under way, on the caller's thread. */
-struct Progress {
-    /** The time between two ticks, the first one included. */
-    std::chrono::nanoseconds interval;
-    /** Called at each tick with its number: 1, 2, 3... Null for none. */
-    std::function<void(long)> tick;
-};
-
 /**
  * Finds the service and makes the call. Returns when both are done, or, promptly, when the deadline
- * has passed.
+ * has passed or a signal has come.
  *
  * @param timeout The time for both; without one they may take as long as they like.
  */

@@ -59,14 +59,20 @@ Report judge(const Request& request, const Outcome& outcome) {
             return {kTransportFailed,
                     method + " failed in the transport, the service may have died: see its log; " +
                             jsonString(outcome.answer.transportError)};
-        case Ending::lateFinding:
-            return {kTooLate,
-                    "vendor.korvan.bex.wifi@1.0-service has not answered in time: it may be busy "
-                    "with "
-                    "other calls or not running"};
-        case Ending::lateCalling:
+        case Ending::late:
+            if (outcome.stage == Stage::lookup) {
+                return {kTooLate,
+                        "vendor.korvan.bex.wifi@1.0-service has not answered in time: it may be "
+                        "busy with other calls or not running"};
+            }
             return {kTooLate, "the deadline passed in " + method +
                                       ": the service's commands may still be running"};
+        case Ending::interrupted:
+            return {kSignalled + outcome.number,
+                    method + " was interrupted by " + strsignal(outcome.number)};
+        case Ending::notStarted:
+            return {kTransportFailed, std::string("no thread can be started: ") +
+                                              strerror(outcome.number) + "; nothing was called"};
     }
     if (request.command->tellsFailure(outcome.answer)) {
         return {kFailed, method + " answered " + outcome.answer.text + ": " +

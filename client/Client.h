@@ -15,7 +15,10 @@
 
 namespace vendor::korvan::bex::wifi::client {
 
-/** What the client ends with; below 126, so that no shell mistakes one for its own. */
+/**
+ * What the client ends with. Its own codes are below 126, so that no shell mistakes one for its
+ * own.
+ */
 enum ExitCode {
     kSuccess = 0,
     /** The service answered -1 or "failure", or the doctor found a problem. */
@@ -23,12 +26,14 @@ enum ExitCode {
     kWrongUsage = 2,
     /** The service cannot be found. */
     kNoService = 3,
-    /** The transport failed in the call. */
+    /** The transport failed in the call, or there was no thread for it. */
     kTransportFailed = 4,
     /** The deadline passed. */
     kTooLate = 5,
     /** The result could not be written. */
     kNotWritten = 6,
+    /** And the number of the signal that ended the wait for an answer, as shells have it. */
+    kSignalled = 128,
 };
 
 /** What the client needs from its surroundings. */
@@ -52,7 +57,7 @@ struct Surroundings {
 /**
  * Runs one command line.
  *
- * After kTooLate a thread may still be in the call (see Call.h): end the process with _exit.
+ * After kTooLate a thread may still be in the call (see base/Worker.h): end the process with _exit.
  *
  * @param arguments The command line without the program's name.
  * @return an ExitCode.

@@ -34,6 +34,7 @@ Exit codes:
   4  the transport failed in the call
   5  the deadline of --timeout passed
   6  the result could not be written to stdout
+  130, 143  SIGINT (Ctrl-C) or SIGTERM ended the wait; nothing tells the service
 
 Methods:
 )";

@@ -36,6 +36,6 @@ int main(int argc, char** argv) {
             runClient(arguments,
                       {std::cout, std::cerr, [] { return IWifiService::tryGetService(); },
                        [] { return IWifiService::getService(); }, isatty(STDERR_FILENO) != 0});
-    // Everything is flushed; a thread may still wait for the service (see Call.h).
+    // Everything is flushed; a thread may still wait for the service (see base/Worker.h).
     _exit(exitCode);
 }

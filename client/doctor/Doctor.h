@@ -30,7 +30,7 @@ struct PhoneView {
  * Makes all checks, in the order in which problems are to be mended.
  *
  * Returns at the latest when the timeout has passed, and the time that the files take. A question
- * that is not answered by then leaves a thread behind, as a late call does (see Call.h).
+ * that is not answered by then leaves a thread behind, as a late call does (see base/Worker.h).
  *
  * @param timeout The time for the service manager and the service, together.
  */

@@ -5,43 +5,18 @@
 
 #include <android/hidl/manager/1.0/IServiceManager.h>
 
-#include <chrono>
-#include <functional>
-#include <future>
-#include <optional>
 #include <string>
-#include <thread>
 
 #include "client/base/Service.h"
 
-// What the doctor asks the service manager and the service. All but ownHash() may block for ever:
-//
-//     auto hash = ask<Reply<Hash>>(deadline, [service] { return servedHash(service); });
-//     if (!hash) return tooLate();
+// What the doctor asks the service manager and the service. All but ownHash() may block for ever,
+// so each is asked on a worker thread (see base/Worker.h).
 
 namespace vendor::korvan::bex::wifi::client {
 
-using Clock = std::chrono::steady_clock;
 using Transport = ::android::hidl::manager::V1_0::IServiceManager::Transport;
 
 constexpr char kInstance[] = "default";
-
-/**
- * The answer to a question, which is put on a thread of its own; nothing when it has not come in
- * time. The thread is then left behind, so the question owns what it uses.
- */
-template <typename Result>
-std::optional<Result> ask(Clock::time_point deadline, std::function<Result()> question) {
-    std::packaged_task<Result()> task(std::move(question));
-    std::future<Result> answer = task.get_future();
-    std::thread worker(std::move(task));
-    if (answer.wait_until(deadline) != std::future_status::ready) {
-        worker.detach();
-        return std::nullopt;
-    }
-    worker.join();
-    return answer.get();
-}
 
 /** What came of one transaction. */
 template <typename Value>

@@ -12,6 +12,7 @@
 #include <climits>
 
 #include "client/base/Json.h"
+#include "client/base/Worker.h"
 #include "client/doctor/PhoneFiles.h"
 #include "client/doctor/Questions.h"
 

@@ -2,11 +2,14 @@
 // SPDX-License-Identifier: Apache-2.0
 
 #include <gtest/gtest.h>
+#include <signal.h>
+#include <unistd.h>
 
 #include <future>
 #include <thread>
 
 #include "FakeService.h"
+#include "Gate.h"
 #include "client/Call.h"
 
 namespace vendor::korvan::bex::wifi::client {
@@ -84,7 +87,8 @@ TEST_F(CallTest, TheDeadlineEndsTheSearch) {
                 return nullptr;
             },
             50ms, kNoProgress);
-    EXPECT_EQ(outcome.ending, Ending::lateFinding);
+    EXPECT_EQ(outcome.ending, Ending::late);
+    EXPECT_EQ(outcome.stage, Stage::lookup);
     EXPECT_GE(outcome.duration, 50ms);
 
     release.set_value();
@@ -99,11 +103,36 @@ TEST_F(CallTest, TheDeadlineEndsTheCallAndTheWorkerMayEndLater) {
         ended.set_value_at_thread_exit();
     };
     const Outcome outcome = callService(mRequest, find(), 2s, kNoProgress);
-    EXPECT_EQ(outcome.ending, Ending::lateCalling);
+    EXPECT_EQ(outcome.ending, Ending::late);
+    EXPECT_EQ(outcome.stage, Stage::call);
     EXPECT_FALSE(outcome.answer.delivered);
 
     release.set_value();
     ended.get_future().wait();
+}
+
+TEST_F(CallTest, ASignalEndsTheCall) {
+    for (const int signal : {SIGINT, SIGTERM}) {
+        Gate gate;
+        mService->onCall = [&gate, signal] {
+            kill(getpid(), signal);
+            gate.wait();
+        };
+        const Outcome outcome = callService(mRequest, find(), std::nullopt, kNoProgress);
+        EXPECT_EQ(outcome.ending, Ending::interrupted);
+        EXPECT_EQ(outcome.number, signal);
+        EXPECT_EQ(outcome.stage, Stage::call);
+    }
+}
+
+// As of a job that a script has put into the background.
+TEST_F(CallTest, AnIgnoredSignalDoesNot) {
+    const auto before = signal(SIGINT, SIG_IGN);
+    mService->onCall = [] { kill(getpid(), SIGINT); };
+    const Outcome outcome = callService(mRequest, find(), std::nullopt, kNoProgress);
+    signal(SIGINT, before);
+    EXPECT_EQ(outcome.ending, Ending::answered);
+    EXPECT_EQ(outcome.stage, Stage::done);
 }
 
 TEST_F(CallTest, TicksAreCountedOnTheCallersThreadUntilTheEnd) {

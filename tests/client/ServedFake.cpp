@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: Apache-2.0
 
 // FakeService as a process: prints "ready" once it is registered and answers 0; a call on channel
-// "die" kills it, one on channel "hang" never ends.
+// "die" kills it, one on channel "hang" prints "called" and never ends.
 
 #include <hidl/HidlTransportSupport.h>
 #include <unistd.h>
@@ -16,7 +16,9 @@ int main() {
             new vendor::korvan::bex::wifi::client::FakeService;
     service->onCall = [&calls = service->calls] {
         if (calls.back().back() == "die") _exit(0);
-        if (calls.back().back() == "hang") pause();
+        if (calls.back().back() != "hang") return;
+        std::cout << "called" << std::endl;
+        pause();
     };
     ::android::hardware::configureRpcThreadpool(1, true);
     if (service->registerAsService() != ::android::OK) return 1;

@@ -9,6 +9,8 @@ own, in which the service is declared.
 import json
 import os
 import pathlib
+import resource
+import signal
 import subprocess
 import tempfile
 
@@ -119,6 +121,28 @@ def test_the_deadline_ends_a_call():
     done = run("RunTxStop", "hang", "--timeout", "2")
     assert (done.returncode, done.stdout) == (5, b"")
     assert "deadline passed in RunTxStop" in only_line(done)
+
+
+@pytest.mark.parametrize("number", [signal.SIGINT, signal.SIGTERM])
+def test_a_signal_ends_a_call(service, number):
+    with subprocess.Popen([CLIENT, "RunTxStop", "hang"], stdout=subprocess.PIPE,
+                          stderr=subprocess.PIPE) as client:
+        assert service.stdout.readline() == b"called\n"
+        client.send_signal(number)
+        out, err = client.communicate(timeout=60)
+    assert (client.returncode, out) == (128 + number, b"")
+    assert err.startswith(b"bex-wifi-client: RunTxStop was interrupted by ")
+    assert err.count(b"\n") == 1
+
+
+@pytest.mark.usefixtures("service")
+def test_without_a_thread_nothing_is_called():
+    # Each thread's stack would be as large as the whole address space.
+    limits = (1 << 47, resource.getrlimit(resource.RLIMIT_STACK)[1])
+    done = run("RunTxStop", "6", "--json",
+               preexec_fn=lambda: resource.setrlimit(resource.RLIMIT_STACK, limits))
+    assert (done.returncode, json.loads(done.stdout)["exit_code"]) == (4, 4)
+    assert only_line(done).startswith("no thread can be started: ")
 
 
 @pytest.mark.usefixtures("service")

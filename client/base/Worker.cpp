@@ -1,0 +1,121 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#include "client/base/Worker.h"
+
+#include <android-base/unique_fd.h>
+#include <poll.h>
+#include <pthread.h>
+#include <signal.h>
+#include <sys/eventfd.h>
+#include <sys/signalfd.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <cerrno>
+
+namespace vendor::korvan::bex::wifi::client {
+namespace {
+
+using ::android::base::unique_fd;
+
+constexpr std::chrono::nanoseconds kLongestPoll = std::chrono::hours(1);
+
+struct Task {
+    std::function<void()> work;
+    /** Becomes readable when the work is done. */
+    unique_fd done;
+};
+
+void* run(void* argument) {
+    const std::unique_ptr<std::shared_ptr<Task>> task(
+            static_cast<std::shared_ptr<Task>*>(argument));
+    (*task)->work();
+    eventfd_write((*task)->done.get(), 1);
+    return nullptr;
+}
+
+/** As long as it lives, the signals that would kill the process wait to be taken. */
+class HeldSignals {
+  public:
+    HeldSignals() {
+        sigemptyset(&mSignals);
+        for (const int signal : {SIGINT, SIGTERM}) {
+            struct sigaction action = {};
+            sigaction(signal, nullptr, &action);
+            if (action.sa_handler == SIG_DFL) sigaddset(&mSignals, signal);
+        }
+        pthread_sigmask(SIG_BLOCK, &mSignals, &mBefore);
+        mFd.reset(signalfd(-1, &mSignals, SFD_CLOEXEC));
+    }
+    ~HeldSignals() { pthread_sigmask(SIG_SETMASK, &mBefore, nullptr); }
+    HeldSignals(const HeldSignals&) = delete;
+    HeldSignals& operator=(const HeldSignals&) = delete;
+
+    /** Readable when there is one to take; -1 when there are no descriptors. */
+    int fd() const { return mFd.get(); }
+
+    int take() const {
+        signalfd_siginfo signal = {};
+        if (TEMP_FAILURE_RETRY(read(mFd.get(), &signal, sizeof(signal))) != sizeof(signal))
+            return 0;
+        return static_cast<int>(signal.ssi_signo);
+    }
+
+  private:
+    sigset_t mSignals;
+    sigset_t mBefore;
+    unique_fd mFd;
+};
+
+void pollUntil(Clock::time_point wake, pollfd (&fds)[2]) {
+    using namespace std::chrono;
+    const Clock::time_point now = Clock::now();
+    const nanoseconds rest =
+            wake <= now ? nanoseconds(0) : std::min(wake, now + kLongestPoll) - now;
+    const timespec timeout = {static_cast<time_t>(duration_cast<seconds>(rest).count()),
+                              static_cast<long>((rest % seconds(1)).count())};
+    for (pollfd& fd : fds) fd.revents = 0;
+    ppoll(fds, 2, &timeout, nullptr);
+}
+
+Waited watch(const Task& task, const HeldSignals& signals, Clock::time_point deadline,
+             const Progress& progress) {
+    using End = Waited::End;
+    const Clock::time_point start = Clock::now();
+    pollfd fds[] = {{task.done.get(), POLLIN, 0}, {signals.fd(), POLLIN, 0}};
+    for (long tick = 1;;) {
+        const Clock::time_point next = start + tick * progress.interval;
+        pollUntil(std::min(deadline, next), fds);
+        if (fds[0].revents != 0) return {End::done};
+        if (fds[1].revents != 0) return {End::interrupted, signals.take()};
+        if (Clock::now() >= deadline) return {End::late};
+        if (Clock::now() < next) continue;
+        if (progress.tick) progress.tick(tick);
+        ++tick;
+    }
+}
+
+} // namespace
+
+Waited waitFor(std::function<void()> work, Clock::time_point deadline, const Progress& progress) {
+    const HeldSignals signals; // before the thread, which must not be the one that they reach
+    const auto task = std::make_shared<Task>(
+            Task{std::move(work), unique_fd(eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK))});
+    if (task->done.get() == -1 || signals.fd() == -1) return {Waited::End::notStarted, errno};
+
+    auto argument = std::make_unique<std::shared_ptr<Task>>(task);
+    pthread_t thread;
+    const int error = pthread_create(&thread, nullptr, run, argument.get());
+    if (error != 0) return {Waited::End::notStarted, error};
+    argument.release(); // NOLINT(bugprone-unused-return-value): the thread's from here on
+    const Waited waited = watch(*task, signals, deadline, progress);
+    if (waited.end == Waited::End::done) {
+        pthread_join(thread, nullptr);
+    } else {
+        pthread_detach(thread);
+    }
+    return waited;
+}
+
+} // namespace vendor::korvan::bex::wifi::client

@@ -1,0 +1,74 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#pragma once
+
+#include <chrono>
+#include <functional>
+#include <memory>
+#include <optional>
+
+// Work that cannot be broken off, such as a call of the service, and a wait for it that ends:
+//
+//     auto hash = ask<Reply<Hash>>(deadline, [service] { return servedHash(service); });
+//     if (!hash) return tooLate();
+//
+// Threads: the work runs on a thread of its own, and the caller's only waits. When the wait ends
+// first, that thread is left where it is. It may be inside of the platform's libraries, so the
+// process then ends with _exit, which leaves their static objects alone.
+
+namespace vendor::korvan::bex::wifi::client {
+
+using Clock = std::chrono::steady_clock;
+
+/** A deadline that never passes. */
+constexpr Clock::time_point kNever = Clock::time_point::max();
+
+/** What happens during a wait, on the caller's thread. */
+struct Progress {
+    /** The time between two ticks, the first one included. */
+    std::chrono::nanoseconds interval = std::chrono::hours(1);
+    /** Called at each tick with its number: 1, 2, 3... Null for none. */
+    std::function<void(long)> tick = nullptr;
+};
+
+/** How a wait ended. */
+struct Waited {
+    enum class End {
+        /** The work is done. */
+        done,
+        /** The deadline passed. */
+        late,
+        /** SIGINT or SIGTERM came. */
+        interrupted,
+        /** There is no thread for the work: it has not begun. */
+        notStarted,
+    };
+
+    End end;
+    /** The signal that came, or the errno that tells why there is no thread. */
+    int number = 0;
+};
+
+/**
+ * Does the work on a thread of its own, and waits for it.
+ *
+ * While it waits, SIGINT and SIGTERM do not kill the process but end the wait, except where the
+ * process ignores them.
+ *
+ * @param work Owns what it uses, since it may outlive the wait.
+ */
+Waited waitFor(std::function<void()> work, Clock::time_point deadline, const Progress& progress);
+
+/** The answer to a question that may block for ever; nothing when it has not come in time. */
+template <typename Result>
+std::optional<Result> ask(Clock::time_point deadline, std::function<Result()> question) {
+    const auto answer = std::make_shared<std::optional<Result>>();
+    const Waited waited =
+            waitFor([answer, question = std::move(question)] { *answer = question(); }, deadline,
+                    {});
+    if (waited.end != Waited::End::done) return std::nullopt;
+    return std::move(*answer);
+}
+
+} // namespace vendor::korvan::bex::wifi::client
