@@ -127,6 +127,10 @@ std::string toString(const hidl_string& text) {
 
 namespace details {
 
+void logAlwaysFatal(const char* message) {
+    LOG_ALWAYS_FATAL("%s", message);
+}
+
 std::string toHexString(uint64_t value) {
     char digits[2 + 16 + 1];
     snprintf(digits, sizeof(digits), "0x%llx", static_cast<unsigned long long>(value));

@@ -3,6 +3,9 @@
 
 #define LOG_TAG "hidl-host"
 
+#include <android/hidl/base/1.0/BpHwBase.h>
+#include <android/hidl/manager/1.0/IServiceManager.h>
+#include <hidl/HidlTransportSupport.h>
 #include <hidl/ServiceManagement.h>
 #include <log/log.h>
 
@@ -17,6 +20,7 @@
 
 namespace android::hardware {
 
+using hidl::base::V1_0::BpHwBase;
 using hidl::base::V1_0::IBase;
 using hidl::manager::V1_0::IServiceManager;
 using hidl::manager::V1_0::IServiceNotification;
@@ -57,25 +61,24 @@ namespace details {
 namespace {
 
 /** What stands behind the name now. */
-RawService lookUp(const std::string& path) {
+sp<IBase> lookUp(const std::string& path) {
     host::FileIdentity identity;
-    if (host::FileIdentity::of(path, &identity) != OK) return {};
+    if (host::FileIdentity::of(path, &identity) != OK) return nullptr;
     // Asking its own socket would wait for a thread that may be the caller's.
     if (sp<IBase> local = host::Registry::get().find(identity); local != nullptr) {
-        return {local, nullptr};
+        return local;
     }
     std::unique_ptr<host::Session> session = host::Session::open(path);
-    if (session == nullptr) return {};
-    return {nullptr, new host::RemoteBinder(std::move(session))};
+    if (session == nullptr) return nullptr;
+    return new BpHwBase(new host::RemoteBinder(std::move(session)));
 }
 
-RawService waitFor(const std::string& path, const char* descriptor, const char* instance) {
+sp<IBase> waitFor(const std::string& path, const char* descriptor, const char* instance) {
     using std::chrono::steady_clock;
     auto nextLine = steady_clock::now() + std::chrono::seconds(1);
     for (;;) {
         host::RegistrationWatch watch;
-        RawService found = lookUp(path);
-        if (found.local != nullptr || found.remote != nullptr) return found;
+        if (sp<IBase> found = lookUp(path); found != nullptr) return found;
         const auto left = nextLine - steady_clock::now();
         if (!watch.wait(std::chrono::ceil<std::chrono::milliseconds>(left)) &&
             steady_clock::now() >= nextLine) {
@@ -103,15 +106,16 @@ status_t registerAsServiceInternal(const sp<IBase>& service, const std::string& 
     return result;
 }
 
-RawService getRawServiceInternal(const std::string& descriptor, const std::string& instance,
-                                 bool retry) {
+sp<IBase> getRawServiceInternal(const std::string& descriptor, const std::string& instance,
+                                bool retry, bool getStub) {
+    if (getStub) return nullptr;
     const std::string path = host::socketPath(descriptor, instance);
-    RawService found = lookUp(path);
-    if (found.local != nullptr || found.remote != nullptr || !retry) return found;
+    sp<IBase> found = lookUp(path);
+    if (found != nullptr || !retry) return found;
     if (!host::isDeclaredInManifest(descriptor, instance)) {
         ALOGW("%s/%s is not registered, and the VINTF manifest does not declare it",
               descriptor.c_str(), instance.c_str());
-        return {};
+        return nullptr;
     }
     return waitFor(path, descriptor.c_str(), instance.c_str());
 }

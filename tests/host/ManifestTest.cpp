@@ -3,6 +3,7 @@
 
 // Which instances the VINTF manifest declares.
 
+#include <android/hidl/manager/1.0/IServiceManager.h>
 #include <hidl/GtestPrinter.h>
 #include <hidl/ServiceManagement.h>
 #include <sys/stat.h>

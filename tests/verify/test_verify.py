@@ -137,6 +137,21 @@ def test_a_source_that_cmake_lacks(copy):
         f"sniffer/Android.bp:{line}: CMake does not build sniffer/SnifferTool.cpp\n")
 
 
+@pytest.mark.parametrize("path, text, told", [
+    ("hidl/ServiceManagement.h", "#include <android/hidl/manager/1.0/IServiceManager.h>",
+     "does not bring android/hidl/manager/1.0/IServiceManager.h"),
+    ("hidl/HidlPassthroughSupport.h", "#include <hwbinder/Parcel.h>", "does not bring hwbinder/Parcel.h"),
+    ("hwbinder/IBinder.h", "#include <vector>", "does not bring vector"),
+    ("hidl/ServiceManagement.h", "struct IServiceManager : public IBase {", "only declares IServiceManager"),
+    ("hidl/HidlString.h", "#pragma once", "has no header of this name"),
+])
+def test_a_generous_header(copy, path, text, told):
+    header = copy / "host/include" / path
+    header.write_text(f"{text}\n{header.read_text() if header.exists() else ''}")
+    assert f"host/include/{path}:1: Android 11" in verify(copy).stderr
+    assert told in verify(copy).stderr
+
+
 def test_a_source_in_two_modules(copy):
     file = copy / "service/Android.bp"
     file.write_text(file.read_text().replace('["main.cpp"]', '["*.cpp"]'))

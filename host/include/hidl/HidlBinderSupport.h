@@ -5,13 +5,8 @@
 
 #include <android/hidl/base/1.0/IBase.h>
 #include <hidl/HidlSupport.h>
-#include <hidl/Status.h>
-#include <hwbinder/Binder.h>
-#include <hwbinder/IInterface.h>
+#include <hwbinder/IBinder.h>
 #include <hwbinder/Parcel.h>
-
-#include <map>
-#include <string>
 
 namespace android::hardware {
 

@@ -3,4 +3,4 @@
 
 #pragma once
 
-#include <hidl/HidlTransportSupport.h>
+#include <android/hidl/base/1.0/IBase.h>

@@ -5,10 +5,13 @@
 
 #include <android/hidl/base/1.0/IBase.h>
 #include <hidl/HidlBinderSupport.h>
+#include <hidl/HidlPassthroughSupport.h>
 #include <hidl/HidlSupport.h>
-#include <hidl/Status.h>
+#include <hidl/HidlTransportUtils.h>
+#include <hidl/ServiceManagement.h>
 
 #include <cstddef>
+#include <mutex>
 #include <string>
 
 namespace android::hardware {
@@ -25,9 +28,6 @@ void configureRpcThreadpool(size_t maxThreads, bool callerWillJoin);
 [[noreturn]] void joinRpcThreadpool();
 
 namespace details {
-
-/** Whether the object implements the interface; a remote one is asked for its interfaceChain(). */
-Return<bool> canCastInterface(hidl::base::V1_0::IBase* interface, const char* name, bool emitError);
 
 /** Process ids and addresses stay private unless the build is debuggable, which it never is here.
  */
@@ -50,6 +50,18 @@ Return<sp<IChild>> castInterface(const sp<IParent>& parent, const char* name, bo
     if (!canCast) return sp<IChild>(nullptr);
     if (parent->isRemote()) return sp<IChild>(new BpChild(toBinder(parent)));
     return sp<IChild>(static_cast<IChild*>(parent.get()));
+}
+
+/** The body of the generated getService() and tryGetService(). There are no passthrough objects. */
+template <typename BpType>
+sp<typename BpType::Pure> getServiceInternal(const std::string& instance, bool retry,
+                                             bool getStub) {
+    using IType = typename BpType::Pure;
+    const sp<hidl::base::V1_0::IBase> found =
+            getRawServiceInternal(IType::descriptor, instance, retry, getStub);
+    if (found == nullptr) return nullptr;
+    if (found->isRemote()) return new BpType(toBinder(found));
+    return static_cast<IType*>(found.get());
 }
 
 } // namespace details

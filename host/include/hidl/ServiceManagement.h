@@ -4,12 +4,14 @@
 #pragma once
 
 #include <android/hidl/base/1.0/IBase.h>
-#include <android/hidl/manager/1.0/IServiceManager.h>
-#include <hidl/HidlTransportSupport.h>
-#include <hidl/Status.h>
+#include <utils/StrongPointer.h>
 
 #include <string>
 #include <vector>
+
+namespace android::hidl::manager::V1_0 {
+struct IServiceManager;
+}
 
 namespace android::hardware {
 
@@ -40,30 +42,15 @@ namespace details {
 status_t registerAsServiceInternal(const sp<hidl::base::V1_0::IBase>& service,
                                    const std::string& name);
 
-/** A found object: in this process, or the way to it elsewhere. Neither when there is none. */
-struct RawService {
-    sp<hidl::base::V1_0::IBase> local;
-    sp<IBinder> remote;
-};
-
 /**
- * Looks up "interface/instance": the same object in the process that registered it, elsewhere the
- * way to it. Nothing when it is not registered, unless `retry` is set and the VINTF manifest
- * declares it: then waits until it is, with a line in the log each second.
+ * Looks up "interface/instance": the same object in the process that registered it, elsewhere a
+ * remote IBase, not yet wrapped into the interface's proxy. Null when it is not registered, unless
+ * `retry` is set and the VINTF manifest declares it: then waits until it is, with a line in the log
+ * each second. Null for `getStub`, as there are no passthrough objects.
  */
-RawService getRawServiceInternal(const std::string& descriptor, const std::string& instance,
-                                 bool retry);
-
-/** The body of the generated getService() and tryGetService(). There are no passthrough objects. */
-template <typename BpType>
-sp<typename BpType::Pure> getServiceInternal(const std::string& instance, bool retry,
-                                             bool getStub) {
-    using IType = typename BpType::Pure;
-    if (getStub) return nullptr;
-    RawService found = getRawServiceInternal(IType::descriptor, instance, retry);
-    if (found.remote != nullptr) return new BpType(found.remote);
-    return sp<IType>(static_cast<IType*>(found.local.get()));
-}
+sp<hidl::base::V1_0::IBase> getRawServiceInternal(const std::string& descriptor,
+                                                  const std::string& instance, bool retry,
+                                                  bool getStub);
 
 } // namespace details
 } // namespace android::hardware

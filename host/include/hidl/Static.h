@@ -4,8 +4,10 @@
 #pragma once
 
 #include <android/hidl/base/1.0/IBase.h>
-#include <hidl/HidlSupport.h>
-#include <hwbinder/Binder.h>
+#include <hidl/ConcurrentMap.h>
+#include <hwbinder/IBinder.h>
+#include <hwbinder/IInterface.h>
+#include <utils/StrongPointer.h>
 
 #include <functional>
 #include <string>

@@ -3,11 +3,12 @@
 
 #pragma once
 
-#include <hidl/HidlSupport.h>
+#include <hidl/HidlInternal.h>
 #include <utils/Errors.h>
+#include <utils/StrongPointer.h>
 
 #include <cstdint>
-#include <ostream>
+#include <sstream>
 #include <string>
 #include <type_traits>
 #include <utility>

@@ -4,10 +4,10 @@
 #pragma once
 
 #include <hwbinder/IBinder.h>
-#include <sched.h>
 
+// The kernel's name, which the generated code uses; the C library of a host has another one.
 #ifndef SCHED_NORMAL
-#define SCHED_NORMAL SCHED_OTHER
+#define SCHED_NORMAL 0
 #endif
 
 namespace android::hardware {

@@ -4,7 +4,7 @@
 #pragma once
 
 #include <cutils/native_handle.h>
-#include <hwbinder/IBinder.h>
+#include <hwbinder/IInterface.h>
 #include <utils/Errors.h>
 
 #include <cstddef>
