@@ -11,7 +11,7 @@ import shutil
 import stat
 import subprocess
 
-from launcher import sandbox
+from launcher import process, sandbox
 from launcher.description import SIMULATOR, Description, checked_path
 from launcher.errors import PhoneError
 
@@ -44,7 +44,7 @@ def create(chip, folder, installs):
     try:
         os.makedirs(f"{unfinished}/root")
         Builder(f"{unfinished}/root").build(description, pairs)
-        kind = sandbox.choose(unfinished)
+        kind = process.choose(unfinished)
         with open(f"{unfinished}/sandbox", "w", encoding="ascii") as record:
             record.write(kind + "\n")
         os.rename(unfinished, folder)

@@ -45,6 +45,7 @@ def main(arguments):
         print(USAGE, end="")
         return 0
     os.umask(0o022)
+    signal.signal(signal.SIGCHLD, signal.SIG_DFL)  # ignored, it would take away the exit codes
     signal.signal(signal.SIGTERM, signal.default_int_handler)  # a command ended by it cleans up
     name = arguments[0] if arguments else ""
     try:
@@ -120,12 +121,12 @@ def restart_service(arguments):
 
 
 def run(arguments):
-    from launcher import sandbox
+    from launcher import process, sandbox
 
     if len(arguments) < 2:
         raise UsageError
     folder = checked_folder(arguments[0])
-    return sandbox.Sandbox(folder, arguments[1:]).wait()
+    return process.run(sandbox.chosen_kind(folder), folder, arguments[1:])
 
 
 def fault(arguments):

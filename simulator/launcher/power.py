@@ -16,7 +16,8 @@ import sys
 import time
 
 from launcher.errors import PhoneError
-from launcher.sandbox import Sandbox, chosen_kind, command_line, socket_folder
+from launcher.process import Sandbox
+from launcher.sandbox import chosen_kind, socket_folder
 
 SERVICE = "/vendor/bin/hw/vendor.korvan.bex.wifi@1.0-service"
 UP_SECONDS = 30
@@ -36,31 +37,29 @@ def up(folder, boot):
     kind = chosen_kind(folder)
     sockets = socket_folder(kind, folder)
     os.makedirs(f"{sockets}/hidl", 0o700, exist_ok=True)
-    command_line(kind, folder)  # a refusal shows here, not in the log
+    command = ["/system/bin/sh", "/phone/lib/init", "boot" if boot else "again", SERVICE]
+    sandbox = Sandbox(kind, folder, command)  # a refusal shows here, not in the log
     for path in _registered(sockets):
         os.remove(path)
     keeper = os.fork()
     if keeper == 0:
-        _keep(folder, boot, sockets)
+        _keep(folder, boot, sockets, sandbox)
     os.ftruncate(lock, 0)
     os.write(lock, f"{keeper}\n".encode())
     _await_service(folder, sockets, keeper)
 
 
-def _keep(folder, boot, sockets):
+def _keep(folder, boot, sockets, sandbox):
     """The keeper: never returns."""
     status = 125
     try:
-        os.setsid()
         log = os.open(f"{folder}/log",
                       os.O_WRONLY | os.O_CREAT | os.O_APPEND | (os.O_TRUNC if boot else 0), 0o644)
         nothing = os.open(os.devnull, os.O_RDWR)
         for number in range(3):
             os.dup2(nothing, number)
-        command = ["/system/bin/sh", "/phone/lib/init", "boot" if boot else "again", SERVICE]
-        status = Sandbox(folder, command, output=log).wait()
-    except SystemExit as end:
-        status = end.code
+        sandbox.streams = [nothing, log, log]
+        status = sandbox.hold()
     finally:
         _remove_borrowed(folder, sockets)
         os._exit(status)

@@ -9,13 +9,10 @@ bwrap  Namespaces of its own for users, processes, network, IPC, host name and c
 proot  Paths are translated with ptrace. Shares the machine's network and process numbers, so every
        capability is dropped, for good, before anything runs; as root that is a condition.
 
-A sandbox never outlives its launcher: the launcher stays its parent and takes in what is orphaned
-below it, and both sandboxes die with their parent.
+Both die with the process that started them; process.py does the rest.
 """
 
-import ctypes
 import os
-import signal
 
 from launcher.errors import PhoneError
 
@@ -29,91 +26,9 @@ ENVIRONMENT = {
 }
 
 KINDS = ("bwrap", "proot")
-PR_SET_CHILD_SUBREAPER = 36  # from <linux/prctl.h>
 CAP_SETPCAP = 8  # from <linux/capability.h>
 LONGEST_SOCKET_FOLDER = 36  # leaves 71 bytes for /hidl/ and the name of a socket
 DEVICES = {"null": (1, 3), "zero": (1, 5), "full": (1, 7), "random": (1, 8), "urandom": (1, 9)}
-
-# The shell reports what cannot be run as adb's does: 127 not found, 126 not executable. proot takes
-# death by a signal for success, so there the shell stays to turn it into 128 + n.
-ENTRY = {"bwrap": 'exec "$@"', "proot": '"$@"; exit $?'}
-
-
-class Sandbox:
-    """One command that runs inside a phone; `output` replaces its stdout and stderr."""
-
-    def __init__(self, folder, command, output=None):
-        self.kind = chosen_kind(folder)
-        line = command_line(self.kind, folder) + [
-            "/system/bin/sh", "-c", ENTRY[self.kind], "sh", *command]
-        _adopt_orphans()
-        for number in (signal.SIGINT, signal.SIGTERM, signal.SIGHUP):
-            signal.signal(number, self._interrupted)
-        signal.pthread_sigmask(signal.SIG_BLOCK, signal.valid_signals())
-        self.pid = os.fork()
-        if self.pid == 0:
-            _become(line, output)
-        signal.pthread_sigmask(signal.SIG_SETMASK, ())
-
-    def wait(self):
-        """The command's exit code, 128 + n for signal n, once no process is left."""
-        status = os.waitpid(self.pid, 0)[1]
-        _end_orphans()
-        if os.WIFSIGNALED(status) and self.kind == "proot":
-            for name in os.listdir("/tmp"):  # what a killed proot leaves there
-                if name.startswith(f"prooted-{self.pid}-"):
-                    os.remove(f"/tmp/{name}")
-        return os.waitstatus_to_exitcode(status) if os.WIFEXITED(status) else 128 + status % 128
-
-    def kill(self):
-        """Ends every process of the sandbox and returns when they are gone."""
-        try:
-            # proot ends what it traces on SIGQUIT only; bwrap's processes die with bwrap.
-            os.kill(self.pid, signal.SIGQUIT if self.kind == "proot" else signal.SIGKILL)
-            os.waitpid(self.pid, 0)
-        except (ProcessLookupError, ChildProcessError):
-            pass  # it had ended by itself
-        _end_orphans()
-
-    def _interrupted(self, number, _frame):
-        self.kill()
-        raise SystemExit(128 + number)
-
-
-def _adopt_orphans():
-    """From now on this process is the parent of every process that is orphaned below it."""
-    ctypes.CDLL(None).prctl(PR_SET_CHILD_SUBREAPER, 1, 0, 0, 0)
-
-
-def _end_orphans():
-    """Kills all children, and theirs in turn, and returns when they are gone."""
-    me = os.getpid()
-    while True:
-        with open(f"/proc/{me}/task/{me}/children", encoding="ascii") as children:
-            for child in children.read().split():
-                os.kill(int(child), signal.SIGKILL)
-        try:
-            os.wait()
-        except ChildProcessError:
-            return
-
-
-def _become(line, output):
-    """In the forked child: turns into the sandbox. Nothing of the caller is inherited but the
-    three standard streams."""
-    try:
-        for number in (signal.SIGINT, signal.SIGTERM, signal.SIGHUP, signal.SIGPIPE):
-            signal.signal(number, signal.SIG_DFL)
-        signal.pthread_sigmask(signal.SIG_SETMASK, ())
-        if output is not None:
-            os.dup2(output, 1)
-            os.dup2(output, 2)
-        os.closerange(3, os.sysconf("SC_OPEN_MAX"))
-        os.execve(line[0], line, ENVIRONMENT)
-    except OSError as error:
-        os.write(2, f"phone: {line[0]}: {error.strerror}\n".encode())
-    finally:
-        os._exit(125)
 
 
 def find_program(name):
@@ -134,30 +49,6 @@ def chosen_kind(folder):
         return asked
     with open(os.path.join(folder, "sandbox"), encoding="ascii") as record:
         return record.read().strip()
-
-
-def choose(folder):
-    """Finds the sandbox that works here for the phone in `folder`."""
-    refusals = []
-    for kind in KINDS:
-        try:
-            if works(kind, folder):
-                return kind
-            refusals.append(f"{kind} is refused here")
-        except PhoneError as error:
-            refusals.append(str(error))
-    raise PhoneError("no sandbox: " + "; ".join(refusals))
-
-
-def works(kind, folder):
-    import subprocess  # slow to load, and only create comes here
-
-    line = command_line(kind, folder) + ["/system/bin/true"]
-    _adopt_orphans()
-    code = subprocess.run(line, env=ENVIRONMENT, stdin=subprocess.DEVNULL, capture_output=True,
-                          check=False).returncode
-    _end_orphans()
-    return code == 0
 
 
 def command_line(kind, folder):
@@ -194,7 +85,7 @@ def _borrowed_devices(root):
 def _bwrap(_folder, root):
     line = [_program("bwrap"), "--unshare-all", "--unshare-user", "--uid", "0", "--gid", "0",
             "--cap-drop", "ALL", "--hostname", "localhost", "--die-with-parent",
-            "--dev-bind", root, "/"]
+            "--new-session", "--dev-bind", root, "/"]
     for device in _borrowed_devices(root):
         line += ["--dev-bind", device, device]
     return line + ["--proc", "/proc", "--remount-ro", "/proc", "--chdir", "/"]

@@ -103,13 +103,14 @@ def test_killing_the_keeper_ends_the_phone(any_phone):
 
 
 @pytest.mark.parametrize("victim, number", [
-    ("launcher", signal.SIGTERM), ("launcher", signal.SIGKILL), ("sandbox", signal.SIGKILL)])
+    ("launcher", signal.SIGTERM), ("launcher", signal.SIGKILL), ("holder", signal.SIGKILL),
+    ("sandbox", signal.SIGKILL)])
 def test_killing_a_run_takes_everything_inside_with_it(any_new_phone, victim, number):
     call = any_new_phone.start(f"busybox setsid sleep {ENDLESS} & sleep {ENDLESS} & "
                                f"exec sleep {ENDLESS}")
     wait_until(lambda: len(any_new_phone.sleepers()) == 3)
     pid = call.pid
-    if victim == "sandbox":
+    for _ in range(("launcher", "holder", "sandbox").index(victim)):
         pid = int(pathlib.Path(f"/proc/{pid}/task/{pid}/children").read_text().split()[0])
     os.kill(pid, number)
     call.wait(10)
