@@ -15,6 +15,7 @@
 #include <memory>
 #include <utility>
 
+#include "host/src/Closing.h"
 #include "host/src/ReceivedBuffer.h"
 
 namespace android::hardware::host {
@@ -66,9 +67,19 @@ unique_fd fileWith(const uint8_t* bytes, size_t size) {
     return file;
 }
 
-/** Reads a peer's file. Only a file in memory is trusted not to keep the thread waiting. */
+/** Whether the next message brings descriptors. It stays where it is. */
+bool bringsDescriptors(int socket) {
+    msghdr head = {};
+    const ssize_t size = TEMP_FAILURE_RETRY(recvmsg(socket, &head, MSG_PEEK | MSG_DONTWAIT));
+    return size >= 0 && (head.msg_flags & MSG_CTRUNC) != 0;
+}
+
+/** Whether to read a file, and to close it, keeps a thread waiting for nobody. */
+bool isInMemory(int file) {
+    return fcntl(file, F_GET_SEALS) >= 0;
+}
+
 bool readFile(int file, uint8_t* bytes, size_t size) {
-    if (fcntl(file, F_GET_SEALS) < 0) return false;
     size_t done = 0;
     while (done < size) {
         const ssize_t got = TEMP_FAILURE_RETRY(
@@ -104,6 +115,8 @@ status_t sendFrame(int socket, FrameHeader header, const Parcel* parcel, int fla
 
 Receipt FrameReader::receive(int flags, FrameHeader* header, Parcel* parcel) {
     if (mAwaitsPayload) return receiveBeside(flags, header, parcel);
+    // To take the message would close them, for which the thread might have to wait.
+    if ((flags & MSG_DONTWAIT) != 0 && bringsDescriptors(mSocket)) return Receipt::kMalformed;
 
     alignas(8) uint8_t message[kMaxInlineFrame];
     // With MSG_TRUNC the length is the sender's, also when the message was longer than the room.
@@ -139,20 +152,28 @@ Receipt FrameReader::receiveBeside(int flags, FrameHeader* header, Parcel* parce
     head.msg_iov = &part;
     head.msg_iovlen = 1;
     head.msg_control = &control;
-    // Room for one descriptor and no padding, in which the kernel would put a second one.
+    // Room for one descriptor and no padding, in which the kernel would put a second one. The
+    // message stays where it is until the descriptor proves harmless.
     head.msg_controllen = CMSG_LEN(sizeof(int));
-    const ssize_t got = TEMP_FAILURE_RETRY(recvmsg(mSocket, &head, flags | MSG_CMSG_CLOEXEC));
-    if (got <= 0) return nothingReceived(got);
-    mAwaitsPayload = false;
-    *header = mAnnounced;
+    const ssize_t got =
+            TEMP_FAILURE_RETRY(recvmsg(mSocket, &head, flags | MSG_PEEK | MSG_CMSG_CLOEXEC));
     unique_fd file;
-    if (const cmsghdr* first = CMSG_FIRSTHDR(&head);
-        first != nullptr && first->cmsg_level == SOL_SOCKET && first->cmsg_type == SCM_RIGHTS) {
+    if (const cmsghdr* first = CMSG_FIRSTHDR(&head); got >= 0 && first != nullptr &&
+                                                     first->cmsg_level == SOL_SOCKET &&
+                                                     first->cmsg_type == SCM_RIGHTS) {
         int descriptor;
         memcpy(&descriptor, CMSG_DATA(first), sizeof(descriptor));
         file.reset(descriptor);
     }
+    if (file.ok() && !isInMemory(file.get())) {
+        closeElsewhere(std::move(file));
+        return Receipt::kMalformed;
+    }
+    if (got <= 0) return nothingReceived(got);
     if (!file.ok() || (head.msg_flags & (MSG_TRUNC | MSG_CTRUNC)) != 0) return Receipt::kMalformed;
+    recv(mSocket, &byte, sizeof(byte), MSG_DONTWAIT);
+    mAwaitsPayload = false;
+    *header = mAnnounced;
 
     ReceivedBuffer payload;
     payload.reservation = Reservation(header->accountedSize());

@@ -14,6 +14,8 @@
 #include <memory>
 #include <utility>
 
+#include "host/src/Closing.h"
+
 namespace android::hardware::host {
 
 bool isTrustedPeer(int socket) {
@@ -37,8 +39,10 @@ void Listener::onReady() {
         mRefused = false;
         if (!isTrustedPeer(client.get())) {
             ALOGW("A client of another user was turned away");
+            closeConnection(std::move(client));
         } else if (Engine::get().isFull()) {
             ALOGW("Too many clients, one was turned away");
+            closeConnection(std::move(client));
         } else {
             Engine::get().add(std::make_shared<Connection>(std::move(client), mTarget));
         }

@@ -15,6 +15,8 @@
 #include <thread>
 #include <utility>
 
+#include "host/src/Closing.h"
+
 namespace android::hardware::host {
 namespace {
 
@@ -31,6 +33,10 @@ size_t halfOfDescriptorLimit() {
 }
 
 } // namespace
+
+Endpoint::~Endpoint() {
+    closeConnection(std::move(mSocket));
+}
 
 Engine& Engine::get() {
     // Never destroyed: its threads run until the process ends.
@@ -144,7 +150,7 @@ void Engine::retryAll() {
 
 bool Engine::isFull() {
     std::lock_guard<std::mutex> lock(mMutex);
-    return mEndpoints.size() >= mMaxEndpoints;
+    return mEndpoints.size() + closingElsewhere() >= mMaxEndpoints;
 }
 
 // An exception that leaves an interface's method ends here, and the process with it.

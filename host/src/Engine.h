@@ -19,7 +19,7 @@ namespace android::hardware::host {
 class Endpoint {
   public:
     explicit Endpoint(base::unique_fd socket) : mSocket(std::move(socket)) {}
-    virtual ~Endpoint() = default;
+    virtual ~Endpoint();
     Endpoint(const Endpoint&) = delete;
     Endpoint& operator=(const Endpoint&) = delete;
 
@@ -35,7 +35,7 @@ class Endpoint {
 
   private:
     friend class Engine;
-    const base::unique_fd mSocket;
+    base::unique_fd mSocket;
     uint64_t mId = 0;
 };
 

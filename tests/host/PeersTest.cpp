@@ -1,0 +1,102 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+// Peers that come in great number, fall silent, leave, or do not read.
+
+#include <future>
+
+#include "tests/host/PeerTest.h"
+
+namespace vendor::korvan::bex::wifi::tests {
+namespace {
+
+using ::android::OK;
+using ::android::base::unique_fd;
+using ::android::hardware::host::FrameHeader;
+
+class PeersTest : public PeerTest {};
+
+// More of them than threads: none holds one.
+TEST_F(PeersTest, PeersThatNeverReadTheirReplies) {
+    std::vector<unique_fd> peers;
+    for (int i = 0; i < 8; ++i) {
+        peers.push_back(connectToServer());
+        for (int j = 0; j < 4; ++j) sendBytes(peers.back().get(), validFrame("large 900000"));
+    }
+    EXPECT_EQ(call(service, "alive"), "alive");
+}
+
+TEST_F(PeersTest, PeersThatSayNothing) {
+    std::vector<unique_fd> peers;
+    for (int i = 0; i < 64; ++i) peers.push_back(connectToServer());
+    EXPECT_EQ(call(service, "alive"), "alive");
+    EXPECT_EQ(call(IWifiService::tryGetService(), "alive"), "alive");
+}
+
+TEST_F(PeersTest, PeersThatLeaveAtOnceLeaveNothingBehind) {
+    const size_t before = descriptorsOfIdleServer();
+    for (int i = 0; i < 300; ++i) {
+        unique_fd peer = connectToServer();
+        if (i % 3 == 1) sendBytes(peer.get(), validFrame("unread"));
+        if (i % 3 == 2) sendBytes(peer.get(), with(validFrame("x"), 4, FrameHeader::kOneway));
+    }
+    EXPECT_TRUE(comesDownTo(before));
+}
+
+TEST_F(PeersTest, SecondCallBeforeTheFirstAnswer) {
+    unique_fd peer = connectToServer();
+    sendBytes(peer.get(), validFrame("wait"));
+    ASSERT_EQ(server->report(), "entered");
+    sendBytes(peer.get(), validFrame("second"));
+    // The other thread comes by, sees that the connection has an owner, and serves this.
+    EXPECT_EQ(call(service, "alive"), "alive");
+    server->openGate();
+    for (int i = 0; i < 2; ++i) {
+        EXPECT_EQ(answerTo(peer.get()).status, OK);
+    }
+}
+
+// The call and the hang-up reach the server as one piece of news.
+TEST_F(PeersTest, PeersThatLeaveBeforeTheirAnswer) {
+    std::vector<unique_fd> peers;
+    for (int i = 0; i < 8; ++i) {
+        peers.push_back(connectToServer());
+        sendBytes(peers.back().get(), validFrame("accepted"));
+        EXPECT_EQ(answerTo(peers.back().get()).status, OK);
+    }
+    auto first = std::async(std::launch::async, [&] { return call(service, "wait"); });
+    ASSERT_EQ(server->report(), "entered");
+    auto second = std::async(std::launch::async, [&] { return call(service, "wait"); });
+    ASSERT_EQ(server->report(), "entered");
+    const size_t before = descriptorsOfServer();
+    for (unique_fd& peer : peers) sendBytes(peer.get(), validFrame("unanswered"));
+    peers.clear();
+    server->openGate();
+    server->openGate();
+    EXPECT_EQ(first.get() + second.get(), "donedone");
+    EXPECT_TRUE(comesDownTo(before - 8));
+    EXPECT_EQ(descriptorsOfServer(), before - 8);
+}
+
+// Too many at once: the server keeps descriptors for its own work and goes on.
+TEST_F(PeersTest, FloodOfConnections) {
+    std::vector<std::string> steps = {"descriptors", "64"};
+    steps.insert(steps.end(), kUsualServer.begin(), kUsualServer.end());
+    server = std::make_unique<ServerProcess>(steps);
+    ASSERT_EQ(server->report(), "0");
+    ASSERT_EQ(server->report(), "ready");
+    service = IWifiService::tryGetService();
+    EXPECT_EQ(call(service, "first"), "first");
+    {
+        std::vector<unique_fd> peers;
+        for (int i = 0; i < 200; ++i) peers.push_back(connectToServer());
+        EXPECT_TRUE(isTurnedAway(peers.back().get()));
+        EXPECT_EQ(call(service, "alive"), "alive");
+        EXPECT_LT(descriptorsOfServer(), 48u);
+    }
+    EXPECT_TRUE(comesDownTo(16));
+    EXPECT_EQ(call(IWifiService::tryGetService(), "anew"), "anew");
+}
+
+} // namespace
+} // namespace vendor::korvan::bex::wifi::tests
