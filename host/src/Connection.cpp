@@ -7,6 +7,7 @@
 
 #include <errno.h>
 #include <log/log.h>
+#include <sys/epoll.h>
 #include <sys/socket.h>
 #include <unistd.h>
 
@@ -25,7 +26,7 @@ bool isTrustedPeer(int socket) {
     return peer.uid == geteuid() || peer.uid == 0;
 }
 
-void Listener::onReady() {
+void Listener::onReady(uint32_t /*events*/) {
     for (;;) {
         base::unique_fd client(
                 TEMP_FAILURE_RETRY(accept4(socket(), nullptr, nullptr, SOCK_CLOEXEC)));
@@ -49,7 +50,7 @@ void Listener::onReady() {
     }
 }
 
-void Connection::onReady() {
+void Connection::onReady(uint32_t events) {
     if (!own()) return;
     for (;;) {
         FrameHeader header;
@@ -65,6 +66,8 @@ void Connection::onReady() {
             return close();
         }
         const bool oneway = (header.flags & FrameHeader::kOneway) != 0;
+        // Who gave up while the call waited for a thread does not want it to begin now.
+        if (!oneway && (events & EPOLLHUP) != 0) continue;
         if (receipt == Receipt::kFrame) {
             serve(header, &request);
         } else if (!oneway) {

@@ -23,7 +23,7 @@ class Listener : public Endpoint {
   public:
     Listener(base::unique_fd socket, const sp<BHwBinder>& target)
           : Endpoint(std::move(socket)), mTarget(target) {}
-    void onReady() override;
+    void onReady(uint32_t events) override;
 
   private:
     const sp<BHwBinder> mTarget;
@@ -39,7 +39,7 @@ class Connection : public Endpoint {
   public:
     Connection(base::unique_fd client, const sp<BHwBinder>& target)
           : Endpoint(std::move(client)), mTarget(target), mReader(socket()) {}
-    void onReady() override;
+    void onReady(uint32_t events) override;
 
   private:
     enum class State { kIdle, kOwned, kOwnedAndReady };

@@ -114,7 +114,7 @@ void Engine::remove(uint64_t id) {
 }
 
 void Engine::retire(uint64_t id) {
-    if (std::shared_ptr<Endpoint> endpoint = find(id)) endpoint->onReady();
+    if (std::shared_ptr<Endpoint> endpoint = find(id)) endpoint->onReady(0);
     remove(id);
 }
 
@@ -144,7 +144,7 @@ void Engine::retryAll() {
         ids.swap(mToRetry);
     }
     for (const uint64_t id : ids) {
-        if (std::shared_ptr<Endpoint> endpoint = find(id)) endpoint->onReady();
+        if (std::shared_ptr<Endpoint> endpoint = find(id)) endpoint->onReady(0);
     }
 }
 
@@ -161,7 +161,7 @@ void Engine::serve() noexcept {
         if (event.data.u64 == kRetryTimer) {
             retryAll();
         } else if (std::shared_ptr<Endpoint> endpoint = find(event.data.u64)) {
-            endpoint->onReady();
+            endpoint->onReady(event.events);
         }
     }
 }

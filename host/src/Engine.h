@@ -26,8 +26,10 @@ class Endpoint {
     /**
      * There is something to read since the last time. Called on any of the threads, also on two at
      * once. Reads until there is nothing, or sees to it that it is called again.
+     *
+     * @param events What epoll tells of the socket at this moment, 0 when it was not asked.
      */
-    virtual void onReady() = 0;
+    virtual void onReady(uint32_t events) = 0;
 
     int socket() const { return mSocket.get(); }
     /** Its name in the engine, never used twice. */

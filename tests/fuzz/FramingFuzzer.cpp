@@ -152,7 +152,7 @@ class Peer {
 
     /** Lets the service read what has come, and returns how many answers it sent. */
     size_t answers() {
-        mConnection->onReady();
+        mConnection->onReady(0);
         FrameReader reader(mSocket.get());
         for (size_t count = 0;; ++count) {
             FrameHeader header;

@@ -3,6 +3,10 @@
 
 // Peers that come in great number, fall silent, leave, or do not read.
 
+#include <sys/mman.h>
+#include <sys/socket.h>
+#include <unistd.h>
+
 #include <future>
 
 #include "tests/host/PeerTest.h"
@@ -76,6 +80,38 @@ TEST_F(PeersTest, PeersThatLeaveBeforeTheirAnswer) {
     EXPECT_EQ(first.get() + second.get(), "donedone");
     EXPECT_TRUE(comesDownTo(before - 8));
     EXPECT_EQ(descriptorsOfServer(), before - 8);
+}
+
+// Who gives up while the threads are busy finds nothing running later.
+TEST_F(PeersTest, CallsOfPeersThatHaveLeftAreDropped) {
+    unique_fd busy[] = {connectToServer(), connectToServer()};
+    for (unique_fd& peer : busy) {
+        sendBytes(peer.get(), validFrame("wait"));
+        ASSERT_EQ(server->report(), "entered");
+    }
+    const FrameInTwo large("queued");
+    unique_fd memory(memfd_create("payload", MFD_CLOEXEC));
+    ASSERT_EQ(::write(memory.get(), large.payload.data(), large.payload.size()),
+              static_cast<ssize_t>(large.payload.size()));
+    for (int i = 0; i < 8; ++i) {
+        unique_fd leaver = connectToServer();
+        if (i % 2 == 0) {
+            sendBytes(leaver.get(), validFrame("queued"));
+        } else {
+            sendBytes(leaver.get(), large.header);
+            sendBytes(leaver.get(), Bytes(1), {memory.get()});
+        }
+    }
+    // Comes after them, and only waits for its answer from now on.
+    unique_fd stays = connectToServer();
+    sendBytes(stays.get(), validFrame("queued"));
+    ASSERT_EQ(shutdown(stays.get(), SHUT_WR), 0);
+
+    server->openGate();
+    server->openGate();
+    for (unique_fd& peer : busy) EXPECT_EQ(answerTo(peer.get()).status, OK);
+    EXPECT_EQ(answerTo(stays.get()).status, OK);
+    EXPECT_EQ(call(service, "count"), "3");
 }
 
 // Too many at once: the server keeps descriptors for its own work and goes on.
