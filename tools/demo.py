@@ -8,9 +8,10 @@ count), what each returned, and the call's result. The lines come from the servi
 """
 
 import pathlib
-import re
 import subprocess
 import sys
+
+import servicelog
 
 PHONE = pathlib.Path(__file__).resolve().parents[1] / "simulator" / "phone"
 
@@ -29,43 +30,14 @@ SESSION = [
     ("Stop the tone", ["RunTxStStop", "11"]),
 ]
 
-# A log line as liblog prints it on a host: tag, priority, date, time, process, thread, text. A text of
-# several lines goes on without that head.
-LOG_HEAD = re.compile(r"^(\S+) ([A-Z]) \d\d-\d\d \d\d:\d\d:\d\d +\d+ +\d+ (.*)$")
-# What follows such a line without a head is what the next command says on stderr.
-COMMAND = re.compile(r'^cmd: "(.*?)" (successful|unsuccessful) execution(?:\n(.*))?$', re.DOTALL)
-# The tags of the two that run commands.
-RUNNERS = {"wifi@1.0-VendorTestSuit", "wifi@1.0-SnifferTool"}
-
-
-def messages(log):
-    """The (tag, text) pairs of a piece of log."""
-    found = []
-    for line in log.split("\n"):
-        head = LOG_HEAD.match(line)
-        if head:
-            found.append([head[1], head[3]])
-        elif found:
-            found[-1][1] += "\n" + line
-    return found
-
 
 def show_commands(log):
     """Prints the commands of a piece of log, each with its outcome and what it printed."""
-    output = ""
-    for tag, text in messages(log):
-        if tag not in RUNNERS:
-            continue
-        command = COMMAND.match(text.rstrip("\n"))
-        if command is None:
-            output += text.rstrip("\n") + "\n"
-            continue
-        outcome = "ok" if command[2] == "successful" else "FAILED"
-        print(f'  "{command[1]}" -> {outcome}')
-        for line in output.splitlines():
+    for command in servicelog.commands(log):
+        print(f'  "{command.line}" -> {"ok" if command.succeeded else "FAILED"}')
+        for line in command.printed.splitlines():
             if line:
                 print(f"      printed: {line}")
-        output = command[3] or ""
 
 
 def main():

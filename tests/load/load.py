@@ -9,14 +9,12 @@ import os
 import pathlib
 import select
 import subprocess
-import sys
 import tempfile
 import time
 
-HERE = pathlib.Path(__file__).resolve().parent
-sys.path.append(str(HERE.parent / "phone"))
+from support.phone import SERVICE
 
-from conftest import SERVICE  # noqa: E402  (found only through the line above)
+HERE = pathlib.Path(__file__).resolve().parent
 
 LOAD = "/vendor/bin/wifi-load"
 SILENCE_SECONDS = 120

@@ -17,8 +17,11 @@ import sys
 import tempfile
 import time
 
-import stations
-from conftest import Phone
+ROOT = pathlib.Path(__file__).resolve().parents[2]
+sys.path += [str(ROOT / folder) for folder in ("tests", "tests/phone", "tools")]
+
+import stations  # noqa: E402  (what it imports is found only through the line above)
+from support.phone import Phone  # noqa: E402
 
 MINUTE = 60
 FIGURES = ["calls", "answered", "cut off", "wrong", "lost", "faults", "kills", "restarts", "grown"]

@@ -11,7 +11,8 @@ import subprocess
 
 import own_answers
 from load import MEMORY_KIB, Gauge, Load, ServiceEnded, load_install
-from conftest import PHONE, ROOT, wait_for
+from support.phone import PHONE, ROOT
+from support.waiting import wait_for
 from test_every_phone import CHIPS, session
 
 VALUES = {

@@ -9,8 +9,9 @@ import subprocess
 import pytest
 
 import own_answers
-from load import MEMORY_KIB, Gauge, Load  # before conftest, for it tells where that is
-from conftest import make_phone_fixture, wait_for  # noqa: F401  (pytest finds the fixture here)
+from load import MEMORY_KIB, Gauge, Load
+from support.phone import make_phone_fixture  # noqa: F401  (pytest finds the fixture here)
+from support.waiting import wait_for
 
 CLIENTS = 64
 CALLS = 10_000

@@ -7,15 +7,13 @@ import os
 import pathlib
 import re
 import shlex
-import sys
 
-from conftest import ROOT, SANITIZE, wait_for
+from launcher import faults
+from support.phone import SANITIZE
+from support.waiting import wait_for
 
 # Of the idle service; ThreadSanitizer's runtime brings one more, as does the search for leaks.
 SERVICE_THREADS = 3 if SANITIZE else 2
-
-sys.path.insert(0, str(ROOT / "simulator"))
-from launcher import faults  # noqa: E402  (found only through the line above)
 
 
 def stage(phone, tool, *actions):

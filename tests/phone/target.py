@@ -10,7 +10,7 @@ import os
 
 import pytest
 
-from conftest import CHIPS
+from support.phone import CHIPS
 
 TARGET_TEST = "/data/vendor.korvan.bex.wifi@1.0-disruptive-target-test"
 

@@ -9,7 +9,7 @@ import subprocess
 
 import pytest
 
-from conftest import wait_for
+from support.waiting import wait_for
 
 COUNTER = ("wl counters  | busybox grep pktengrxdmcast | busybox awk '{for(i = 1;i <= NF;i++) "
            "{if(\"pktengrxdmcast\" == $i) print $(i + 1)} }' ")

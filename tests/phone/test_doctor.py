@@ -11,9 +11,9 @@ import signal
 
 import pytest
 
-from conftest import ROOT, SERVICE, wait_for
+from support.phone import CHIPS, SERVICE
+from support.waiting import wait_for
 
-CHIPS = sorted(path.name for path in (ROOT / "simulator/phones").iterdir())
 FRAGMENT = f"vendor/etc/vintf/manifest/{SERVICE}.xml"
 
 

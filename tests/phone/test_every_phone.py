@@ -7,7 +7,7 @@ import re
 
 import pytest
 
-from conftest import CHIPS
+from support.phone import CHIPS
 
 # The forms of what a reception answers; what is not told is told of the driver-tool families.
 COUNT = r"\d+"

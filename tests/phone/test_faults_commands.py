@@ -14,17 +14,15 @@ the first and the last line of each operation, whose output is what an operation
 import contextlib
 import os
 import re
-import sys
 
 import pytest
 
-from conftest import ROOT, wait_for
+from catalogue import CALLS
+from support.phone import CHIPS
+from support.waiting import wait_for
 from faults import Line, assert_holds, idle_census, stage
 
-sys.path.insert(0, str(ROOT / "tools"))
-from catalogue import CALLS  # noqa: E402  (found only through the line above)
 
-CHIPS = sorted(path.name for path in (ROOT / "simulator/phones").iterdir())
 ALL_FAULTS = os.environ.get("BEX_FAULTS") == "all"
 
 # Those whose insmod may fail, and those that print the counter itself, with the word that is removed.

@@ -6,15 +6,14 @@ import os
 import signal
 import socket
 import subprocess
-import sys
 
 import pytest
 
-from conftest import ROOT, SERVICE, wait_for
+from catalogue import CALLS
+from support.phone import ROOT, SERVICE
+from support.waiting import wait_for
 from faults import Line, nothing_lost, service_process, stage
 
-sys.path.insert(0, str(ROOT / "tools"))
-from catalogue import CALLS  # noqa: E402  (found only through the line above)
 
 SOCKET = f"dev/socket/hidl/{SERVICE.removesuffix('-service')}::IWifiService~default"
 ONE_CALL_OF_EACH = list({call[0]: call for call in CALLS if call[0] != "isMimoSupport"}.values())

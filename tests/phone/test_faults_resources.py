@@ -13,7 +13,8 @@ import tempfile
 
 import pytest
 
-from conftest import PHONE, wait_for
+from support.phone import PHONE
+from support.waiting import wait_for
 from faults import nothing_lost, processes, service_process, stage
 
 NOBODY = 65534

@@ -9,7 +9,8 @@ import shlex
 
 import pytest
 
-from conftest import ROOT, wait_for
+from support.phone import ROOT
+from support.waiting import wait_for
 from faults import nothing_lost, stage
 
 TRANSMIT = ["RunTxBGStart", "6", "54", "15", "1"]

@@ -8,7 +8,7 @@ import subprocess
 
 import pytest
 
-from conftest import REPORT, REPORT_EXIT_CODE, SANITIZE
+from support.phone import REPORT, REPORT_EXIT_CODE, SANITIZE
 
 # Each flaw with a part of its report.
 FLAWS = {

@@ -1,0 +1,13 @@
+# Copyright 2026 The BEX Wi-Fi Authors
+# SPDX-License-Identifier: Apache-2.0
+"""Waiting for what another process does."""
+
+import time
+
+
+def wait_for(condition):
+    """Waits until the condition holds; a minute means that it never will."""
+    deadline = time.monotonic() + 60
+    while not condition():
+        assert time.monotonic() < deadline, "the condition never came true"
+        time.sleep(0.005)
