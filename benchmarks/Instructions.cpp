@@ -18,6 +18,7 @@
 
 #include "recorder/RecordedShell.h"
 #include "service/WifiService.h"
+#include "shell/Command.h"
 
 namespace {
 
@@ -208,10 +209,7 @@ void countOutput() {
         while (fgets(piece, sizeof(piece), stream) != nullptr) collected += piece;
         pclose(stream);
     });
-    count("output runCommand 1024", [] {
-        CommandResult result;
-        runCommand("tool", "tag", result);
-    });
+    count("output runCommand 1024", [] { runCommand("tool", "tag"); });
     gReadingCounts = false;
 }
 

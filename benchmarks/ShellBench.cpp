@@ -57,7 +57,7 @@ std::string bareLoop(const char* line) {
 
 std::string throughSuite(const char* line) {
     static BrcmTestSuit suit;
-    CommandResult result;
+    VendorTestSuit::CmdRunResult result;
     suit.runCmdCom(line, result);
     require(result.status == 0, "the command");
     return std::move(result.output);

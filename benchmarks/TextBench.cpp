@@ -56,7 +56,7 @@ void replaceNewlines(benchmark::State& state) {
 template <typename Suit>
 class AnsweredSuit : public Suit {
   public:
-    void runCmdCom(const std::string&, CommandResult& result) override {
+    void runCmdCom(const std::string&, VendorTestSuit::CmdRunResult& result) override {
         result.status = 0;
         result.output = std::exchange(mOutput, "");
     }

@@ -40,6 +40,8 @@ class RecordedShell {
         int priority;
         std::string tag;
         std::string text;
+        /** What the text was made from. Takes no part in a comparison. */
+        std::string format = {};
         bool operator==(const LogLine& other) const;
     };
 

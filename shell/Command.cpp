@@ -6,16 +6,11 @@
 #include <android/log.h>
 #include <stdio.h>
 
-#include <utility>
-
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
-void runCommand(const std::string& cmd, const char* tag, CommandResult& result) {
-    result.status = -1;
-    result.output.clear();
-
+std::optional<std::string> runCommand(const std::string& cmd, const char* tag) {
     FILE* stream = popen(cmd.c_str(), "r");
-    if (stream == nullptr) return;
+    if (stream == nullptr) return std::nullopt;
 
     std::string collected;
     char piece[256] = {};
@@ -25,15 +20,12 @@ void runCommand(const std::string& cmd, const char* tag, CommandResult& result) 
         collected += piece;
     }
 
-    if (pclose(stream) == 0) {
-        result.status = 0;
-        result.output = std::move(collected);
-        __android_log_print(ANDROID_LOG_DEBUG, tag, "cmd: \"%s\" %s execution", cmd.c_str(),
-                            "successful");
-    } else {
-        __android_log_print(ANDROID_LOG_ERROR, tag, "cmd: \"%s\" %s execution", cmd.c_str(),
-                            "unsuccessful");
-    }
+    const bool succeeded = pclose(stream) == 0;
+    __android_log_print(succeeded ? ANDROID_LOG_DEBUG : ANDROID_LOG_ERROR, tag,
+                        "cmd: \"%s\" %s execution", cmd.c_str(),
+                        succeeded ? "successful" : "unsuccessful");
+    if (!succeeded) return std::nullopt;
+    return collected;
 }
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

@@ -3,21 +3,25 @@
 
 #include "shell/CommandTable.h"
 
-#include <algorithm>
-
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
-std::string commandLine(const Row& row) {
-    return lineOfWords(row.begin(), std::find(row.begin(), row.end(), std::string_view()));
+std::string lineUpToEmptyWord(const Command& command) {
+    std::string line;
+    for (const std::string& word : command) {
+        if (word.empty()) break;
+        line += word + " ";
+    }
+    return line;
 }
 
-int runTable(const Table& table, const LineRunner& run, CommandResult& result) {
-    int status = 0;
-    for (const Row& row : table) {
-        run(commandLine(row), result);
-        if (result.status != 0) status = -1;
-    }
-    return status;
+std::string lineOfEveryWord(const Command& command) {
+    std::string line;
+    for (const std::string& word : command) line += word + " ";
+    return line;
+}
+
+bool isInsmod(const std::string& line) {
+    return line.rfind("insmod", 0) == 0;
 }
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

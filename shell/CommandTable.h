@@ -3,59 +3,84 @@
 
 #pragma once
 
-#include <array>
-#include <functional>
-#include <initializer_list>
-#include <string>
-#include <string_view>
+#include <android/log.h>
 
-#include "shell/Command.h"
+#include <functional>
+#include <string>
+#include <vector>
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
+/** The words of one command. They may hold blanks, quotes and redirections: nothing is quoted. */
+using Command = std::vector<std::string>;
+
+/** Commands in the order in which they run. */
+using CommandTable = std::vector<Command>;
+
 /**
- * One command of a table: up to 25 words, the first empty one ends it. So an empty argument cuts
- * off the words behind it, which is what the tools' users rely on.
+ * The command line of the words before the first empty one, each followed by one blank. So an empty
+ * argument cuts off the words after it, which is what the tools' users rely on.
+ */
+std::string lineUpToEmptyWord(const Command& command);
+
+/** The command line of all words, each followed by one blank: an empty word leaves its blank. */
+std::string lineOfEveryWord(const Command& command);
+
+/** Whether a driver may refuse the line: it may be loaded already, or not fit the chip. */
+bool isInsmod(const std::string& line);
+
+/** Hands on the output of one row of a table, counted from 1, as soon as that row has run. */
+struct AfterRow {
+    size_t row = 0;
+    std::function<void(const std::string& output)> take;
+};
+
+/**
+ * Runs every command of a table in order, also after a failure; a line ends at its first empty
+ * word.
  *
- * Words may hold blanks, quotes and redirections; the shell sees them as they stand. A row does not
- * own its words: a word made for the occasion needs a variable that outlives the run.
+ *     return runTable(*this, {{"ifconfig", "wlan0", "down"}, {"wl", "counters"}},
+ *                     AfterRow{2, [&](const std::string& output) { out = output; }});
+ *
+ * @param runner The suite or sniffer controller whose runCmdCom runs the lines.
+ * @return 0 when all succeeded, else -1.
  */
-using Row = std::array<std::string_view, 25>;
-
-/**
- * Commands in the order in which they run. Written where it is used, as in the example below: it
- * ends with the expression that it stands in, which spares the rows a way through the heap.
- */
-using Table = std::initializer_list<Row>;
-
-/** A command line of words: each followed by one blank, the last one too. */
-template <typename Iterator>
-std::string lineOfWords(Iterator first, Iterator last) {
-    size_t length = 0;
-    for (Iterator word = first; word != last; ++word) length += word->size() + 1;
-    std::string line(length, ' ');
-    char* end = line.data();
-    for (Iterator word = first; word != last; ++word) end += word->copy(end, word->size()) + 1;
-    return line;
+template <typename Runner>
+int runTable(Runner& runner, const CommandTable& table, const AfterRow& after = {}) {
+    int status = 0;
+    typename Runner::CmdRunResult result;
+    for (size_t row = 1; row <= table.size(); ++row) {
+        runner.runCmdCom(lineUpToEmptyWord(table[row - 1]), result);
+        if (result.status != 0) status = -1;
+        if (row == after.row) after.take(result.output);
+    }
+    return status;
 }
 
-/** The command line of a row: each word followed by one blank, the last one too. */
-std::string commandLine(const Row& row);
-
-/** Runs one command line, as runCmdCom of the suites and of the sniffer controller does. */
-using LineRunner = std::function<void(const std::string& cmd, CommandResult& result)>;
-
 /**
- * Runs every command of a table in order, whatever became of the ones before.
+ * The same with every word in the line, and with each line in the log before it runs, as "<method>:
+ * <line>". At error priority, so that it shows in a log that keeps nothing less.
  *
- *     CommandResult result;
- *     int status = runTable({{"ifconfig", "wlan0", "down"}, {"wl", "counters"}}, run, result);
+ * A line that begins with "insmod" may fail. One that begins with a path, as "/vendor/bin/insmod"
+ * does, may not.
  *
- * @param table The commands.
- * @param run Runs each command line.
- * @param result Used for every command in turn: holds the last one's result afterwards.
- * @return 0 when all succeeded, -1 when at least one failed.
+ * @param tag The runner's log tag.
+ * @param method The operation's name, for the log.
  */
-int runTable(const Table& table, const LineRunner& run, CommandResult& result);
+template <typename Runner>
+int runLoggedTable(Runner& runner, const char* tag, const std::string& method,
+                   const CommandTable& table, const AfterRow& after = {}) {
+    const std::string format = method + ": %s";
+    int status = 0;
+    typename Runner::CmdRunResult result;
+    for (size_t row = 1; row <= table.size(); ++row) {
+        const std::string line = lineOfEveryWord(table[row - 1]);
+        __android_log_print(ANDROID_LOG_ERROR, tag, format.c_str(), line.c_str());
+        runner.runCmdCom(line, result);
+        if (result.status != 0 && !isInsmod(line)) status = -1;
+        if (row == after.row) after.take(result.output);
+    }
+    return status;
+}
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

@@ -7,7 +7,7 @@ namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 namespace {
 
-std::string_view bandwidthCode(const std::string& bandwidth) {
+const char* bandwidthCode(const std::string& bandwidth) {
     if (bandwidth == "20") return "0";
     if (bandwidth == "40") return "1";
     if (bandwidth == "80") return "2";
@@ -16,7 +16,7 @@ std::string_view bandwidthCode(const std::string& bandwidth) {
 
 } // namespace
 
-Row setMonitorChannel(const std::string& channel, const std::string& bandwidth) {
+Command setMonitorChannel(const std::string& channel, const std::string& bandwidth) {
     return {"/vendor/bin/iwpriv wlan0 setMonChan", channel, bandwidthCode(bandwidth)};
 }
 

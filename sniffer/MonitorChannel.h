@@ -13,9 +13,9 @@ namespace vendor::korvan::bex::wifi::V1_0::implementation {
  * The command that sets the channel of monitor mode by the driver's private commands (`iwpriv`), as
  * newer Qualcomm drivers want it.
  *
- * @param channel The IEEE 802.11 channel number in decimal. The row does not own it.
+ * @param channel The IEEE 802.11 channel number in decimal.
  * @param bandwidth The channel width in MHz: exactly "20", "40" or "80"; all else is taken for 160.
  */
-Row setMonitorChannel(const std::string& channel, const std::string& bandwidth);
+Command setMonitorChannel(const std::string& channel, const std::string& bandwidth);
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

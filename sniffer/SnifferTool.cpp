@@ -6,19 +6,23 @@
 #include <android/log.h>
 #include <stdlib.h>
 
+#include <utility>
+
+#include "shell/Command.h"
+
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 namespace {
 
 constexpr const char* kLogTag = "wifi@1.0-SnifferTool";
-constexpr std::string_view kModeFile = "/sys/module/wlan/parameters/con_mode";
+const std::string kModeFile = "/sys/module/wlan/parameters/con_mode";
 
 // The modes that the driver's con_mode parameter knows.
 constexpr int kMonitorMode = 4;
 constexpr int kFactoryTestMode = 5;
 
 /** The HT mode word of `iw set channel`. */
-std::string_view htMode(const std::string& channel, const std::string& bandwidth) {
+const char* htMode(const std::string& channel, const std::string& bandwidth) {
     if (bandwidth == "20") return "HT20";
     return channel == "1" || channel == "36" || channel == "149" ? "HT40+" : "HT40-";
 }
@@ -35,13 +39,6 @@ SnifferTool::~SnifferTool() {
 
 // clang-format off
 
-const SnifferTool::CaptureServices SnifferTool::kByProperties = {
-    /* stopTcpdump  */ {"setprop vendor.hardware.wlan.runtcpdump stop"},
-    /* startSniffer */ {"setprop vendor.hardware.wlan.runsniffer start"},
-    /* stopSniffer  */ {"setprop vendor.hardware.wlan.runsniffer stop"},
-    /* startTcpdump */ {"setprop vendor.hardware.wlan.runtcpdump start"},
-};
-
 int SnifferTool::snifferStart(const std::string& channel, const std::string& bandwidth) {
     return enterMonitorMode(kByProperties,
         {"/vendor/bin/iw wlan0 set channel", channel, htMode(channel, bandwidth)});
@@ -51,22 +48,22 @@ int SnifferTool::snifferStop() {
     return leaveMonitorMode(kByProperties);
 }
 
-int SnifferTool::enterMonitorMode(const CaptureServices& services, const Row& setChannel) {
-    return runTable({
-        services.stopTcpdump,
+int SnifferTool::enterMonitorMode(const CaptureServices& services, const Command& setChannel) {
+    return runTable(*this, {
+        {services.stopTcpdump},
         {"echo 4", ">", kModeFile},
         {"/vendor/bin/ifconfig", "wlan0", "up"},
         setChannel,
-        services.startSniffer,
+        {services.startSniffer},
     });
 }
 
 int SnifferTool::leaveMonitorMode(const CaptureServices& services) {
-    return runTable({
-        services.stopSniffer,
+    return runTable(*this, {
+        {services.stopSniffer},
         {"/vendor/bin/ifconfig", "wlan0", "down"},
         {"echo 0", ">", kModeFile},
-        services.startTcpdump,
+        {services.startTcpdump},
     });
 }
 
@@ -85,20 +82,15 @@ int SnifferTool::getWlanMode() {
 }
 
 void SnifferTool::runCmdCom(const std::string& cmd, CmdRunResult& result) {
-    runCommand(cmd, kLogTag, result);
-}
-
-int SnifferTool::runTable(const Table& table) {
-    CmdRunResult result;
-    return implementation::runTable(
-            table,
-            [this](const std::string& cmd, CmdRunResult& cmdResult) { runCmdCom(cmd, cmdResult); },
-            result);
+    result = {};
+    if (std::optional<std::string> output = runCommand(cmd, kLogTag)) {
+        result = {0, std::move(*output)};
+    }
 }
 
 std::string SnifferTool::readMode(const char* caller) {
     CmdRunResult result;
-    runCmdCom(commandLine({"/vendor/bin/cat", kModeFile}), result);
+    runCmdCom(lineUpToEmptyWord({"/vendor/bin/cat", kModeFile}), result);
     if (result.output.empty()) {
         __android_log_print(ANDROID_LOG_ERROR, kLogTag, "%s return data error!", caller);
     } else {

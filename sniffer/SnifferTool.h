@@ -3,11 +3,28 @@
 
 #pragma once
 
+#include <cstdint>
 #include <string>
 
 #include "shell/CommandTable.h"
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
+
+/** How the phone's init is told to start and stop its two capture services: whole commands. */
+struct CaptureServices {
+    const char* stopTcpdump;
+    const char* startSniffer;
+    const char* stopSniffer;
+    const char* startTcpdump;
+};
+
+/** By system properties, which init watches. */
+inline constexpr CaptureServices kByProperties = {
+        /* stopTcpdump  */ "setprop vendor.hardware.wlan.runtcpdump stop",
+        /* startSniffer */ "setprop vendor.hardware.wlan.runsniffer start",
+        /* stopSniffer  */ "setprop vendor.hardware.wlan.runsniffer stop",
+        /* startTcpdump */ "setprop vendor.hardware.wlan.runtcpdump start",
+};
 
 /**
  * Puts the WLAN driver into monitor mode on a channel, takes it out again and reads its mode, with
@@ -18,7 +35,13 @@ namespace vendor::korvan::bex::wifi::V1_0::implementation {
  */
 class SnifferTool {
   public:
-    using CmdRunResult = CommandResult;
+    /** What one command left behind. */
+    struct CmdRunResult {
+        /** 0 when the command ran and ended with exit status 0, else -1. */
+        int32_t status = -1;
+        /** What the command wrote to its standard output when status is 0, else empty. */
+        std::string output;
+    };
 
     SnifferTool();
     virtual ~SnifferTool();
@@ -44,32 +67,17 @@ class SnifferTool {
     /** Returns the driver's mode: 0 (normal), 4 (monitor), 5 (factory test), -1 for all else. */
     virtual int getWlanMode();
 
-    /** Runs one command line and collects its output; see runCommand. */
+    /** Runs one command line and collects its output in `result`; see runCommand. */
     void runCmdCom(const std::string& cmd, CmdRunResult& result);
 
   protected:
-    /** How the phone's init is told to start and stop its two capture services. */
-    struct CaptureServices {
-        Row stopTcpdump;
-        Row startSniffer;
-        Row stopSniffer;
-        Row startTcpdump;
-    };
-
-    /** By system properties, which init watches. */
-    static const CaptureServices kByProperties;
-
-    /** Enters monitor mode on the channel that the row `setChannel` sets, and starts the capture.
-     */
-    int enterMonitorMode(const CaptureServices& services, const Row& setChannel);
+    /** Enters monitor mode on the channel that `setChannel` sets, and starts the capture. */
+    int enterMonitorMode(const CaptureServices& services, const Command& setChannel);
 
     /** Ends the capture and leaves monitor mode. */
     int leaveMonitorMode(const CaptureServices& services);
 
   private:
-    /** Runs a table through runCmdCom. */
-    int runTable(const Table& table);
-
     /** Reads the driver's mode file; an empty text, with an error line, when it cannot be read. */
     std::string readMode(const char* caller);
 };

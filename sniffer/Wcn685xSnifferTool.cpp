@@ -7,16 +7,16 @@
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
-// clang-format off
+namespace {
 
-const SnifferTool::CaptureServices Wcn685xSnifferTool::kDirectly = {
-    /* stopTcpdump  */ {"/vendor/bin/stop vendor.tcpdump"},
-    /* startSniffer */ {"/vendor/bin/start vendor.sniffer"},
-    /* stopSniffer  */ {"/vendor/bin/stop vendor.sniffer"},
-    /* startTcpdump */ {"/vendor/bin/start vendor.tcpdump"},
+constexpr CaptureServices kDirectly = {
+        /* stopTcpdump  */ "/vendor/bin/stop vendor.tcpdump",
+        /* startSniffer */ "/vendor/bin/start vendor.sniffer",
+        /* stopSniffer  */ "/vendor/bin/stop vendor.sniffer",
+        /* startTcpdump */ "/vendor/bin/start vendor.tcpdump",
 };
 
-// clang-format on
+} // namespace
 
 int Wcn685xSnifferTool::snifferStart(const std::string& channel, const std::string& bandwidth) {
     return enterMonitorMode(kDirectly, setMonitorChannel(channel, bandwidth));

@@ -16,9 +16,6 @@ class Wcn685xSnifferTool : public SnifferTool {
     /** See setMonitorChannel for the forms of `channel` and `bandwidth`. */
     int snifferStart(const std::string& channel, const std::string& bandwidth) override;
     int snifferStop() override;
-
-  private:
-    static const CaptureServices kDirectly;
 };
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

@@ -6,6 +6,7 @@
 #include <android/log.h>
 #include <stdlib.h>
 
+#include "shell/CommandTable.h"
 #include "suites/Channel.h"
 #include "suites/Reception.h"
 
@@ -18,26 +19,26 @@ constexpr const char* kLogTag = "wifi@1.0-BrcmTestSuit-brcm";
 // The rows that the operations share. The quotes are for the shell, and echo -n keeps a newline out
 // of the driver's parameter.
 // clang-format off
-constexpr Row kInterfaceDown = {"ifconfig", "wlan0", "down"};
-constexpr Row kInterfaceUp   = {"ifconfig", "wlan0", "up"};
-constexpr Row kMfgFirmware   = {"echo", "-n", "\"/etc/firmware/fw_bcmdhd_mfg.bin\"", ">",
+const Command kInterfaceDown = {"ifconfig", "wlan0", "down"};
+const Command kInterfaceUp   = {"ifconfig", "wlan0", "up"};
+const Command kMfgFirmware   = {"echo", "-n", "\"/etc/firmware/fw_bcmdhd_mfg.bin\"", ">",
                                 "/sys/module/bcmdhd/parameters/firmware_path"};
-constexpr Row kFirmware      = {"echo", "-n", "\"/etc/firmware/fw_bcmdhd.bin\"", ">",
+const Command kFirmware      = {"echo", "-n", "\"/etc/firmware/fw_bcmdhd.bin\"", ">",
                                 "/sys/module/bcmdhd/parameters/firmware_path"};
-constexpr Row kStartTx       = {"wl", "pkteng_start", "00:11:22:33:44:55", "tx", "100", "1024", "0"};
-constexpr Row kStopTx        = {"wl", "pkteng_stop", "tx"};
-constexpr Row kStartRx       = {"wl", "pkteng_start", "00:11:22:33:44:55", "rx"};
+const Command kStartTx       = {"wl", "pkteng_start", "00:11:22:33:44:55", "tx", "100", "1024", "0"};
+const Command kStopTx        = {"wl", "pkteng_stop", "tx"};
+const Command kStartRx       = {"wl", "pkteng_start", "00:11:22:33:44:55", "rx"};
 
 // The chip counts the packets that its packet engine receives as pktengrxdmcast; the listing holds
 // every other counter too.
-constexpr Row kReadCounter   = {"wl", "counters",
+const Command kReadCounter   = {"wl", "counters",
                                 " | busybox grep pktengrxdmcast | busybox awk "
                                 R"('{for(i = 1;i <= NF;i++) {if("pktengrxdmcast" == $i) )"
                                 "print $(i + 1)} }'"};
 // clang-format on
 
 /** The band as `wl band` names it. */
-std::string_view bandName(const std::string& channel) {
+const char* bandName(const std::string& channel) {
     return is5GHz(channel) ? "a" : "b";
 }
 
@@ -55,7 +56,7 @@ BrcmTestSuit::~BrcmTestSuit() {
 
 int BrcmTestSuit::RunTxBGStart(const std::string& channel, const std::string& rate,
                                const std::string& power, const std::string& chain) {
-    return runTable({
+    return runTable(*this, {
         kInterfaceDown,
         kMfgFirmware,
         kInterfaceUp,
@@ -79,11 +80,11 @@ int BrcmTestSuit::RunTxBGStart(const std::string& channel, const std::string& ra
 int BrcmTestSuit::RunTxNStart(const std::string& channel, const std::string& bandwidth,
                               const std::string& rate, const std::string& power, bool vht,
                               const std::string& chain) {
-    const std::string_view rateCommand =
+    const std::string rateCommand =
             vht ? "5g_rate -v" : is5GHz(channel) ? "5g_rate -h" : "2g_rate -h";
-    const std::string_view streams = !vht ? "" : atoi(chain.c_str()) > 2 ? "-s 2" : "-s 1";
+    const std::string streams = !vht ? "" : atoi(chain.c_str()) > 2 ? "-s 2" : "-s 1";
     const std::string chanspec = channel + "/" + bandwidth;
-    return runTable({
+    return runTable(*this, {
         kInterfaceDown,
         kMfgFirmware,
         kInterfaceUp,
@@ -109,7 +110,7 @@ int BrcmTestSuit::RunTxNStart(const std::string& channel, const std::string& ban
 
 int BrcmTestSuit::RunTxAxStart(const std::string&, const std::string&, const std::string&,
                                const std::string&, const std::string&, const std::string&) {
-    return runTable({
+    return runTable(*this, {
         kInterfaceDown,
         kMfgFirmware,
         kInterfaceUp,
@@ -123,7 +124,7 @@ int BrcmTestSuit::RunTxAxStart(const std::string&, const std::string&, const std
 
 int BrcmTestSuit::RunTxStStart(const std::string& channel, const std::string&,
                                const std::string& chain) {
-    return runTable({
+    return runTable(*this, {
         kInterfaceDown,
         kMfgFirmware,
         kInterfaceUp,
@@ -135,7 +136,7 @@ int BrcmTestSuit::RunTxStStart(const std::string& channel, const std::string&,
 }
 
 int BrcmTestSuit::RunTxStStop(const std::string&) {
-    return runTable({
+    return runTable(*this, {
         {"wl", "fqacurcy", "0"},
         kInterfaceDown,
         kFirmware,
@@ -143,7 +144,7 @@ int BrcmTestSuit::RunTxStStop(const std::string&) {
 }
 
 int BrcmTestSuit::RunTxStop(const std::string&) {
-    return runTable({
+    return runTable(*this, {
         kStopTx,
         kInterfaceDown,
         kFirmware,
@@ -151,7 +152,7 @@ int BrcmTestSuit::RunTxStop(const std::string&) {
 }
 
 int BrcmTestSuit::RunRxApJoinHoc(const std::string& ssid, const std::string& address) {
-    return runTable({
+    return runTable(*this, {
         kInterfaceDown,
         kMfgFirmware,
         {"ifconfig", "wlan0", address, "up"},
@@ -177,7 +178,7 @@ int BrcmTestSuit::RunRxNStart(std::string channel, const std::string& bandwidth,
 
 int BrcmTestSuit::RunRxAxStart(const std::string&, const std::string&, const std::string&,
                                const std::string&, std::string& out) {
-    const int status = runTable({
+    const int status = runTable(*this, {
         kInterfaceDown,
         kMfgFirmware,
         kInterfaceUp,
@@ -191,24 +192,23 @@ int BrcmTestSuit::RunRxAxStart(const std::string&, const std::string&, const std
 }
 
 int BrcmTestSuit::RunRxStop(const std::string&, std::string& out) {
-    CmdRunResult counter;
-    const int status = runTable({kReadCounter}, counter);
+    const int status = runTable(*this, {
+        kReadCounter,
+    }, AfterRow{1, [&](const std::string& output) { out = packetCount(output); }});
     RunStopDriver();
-    out = packetCount(counter.output);
     return status;
 }
 
 int BrcmTestSuit::RunStopDriver() {
-    return runTable({
+    return runTable(*this, {
         kInterfaceDown,
         kFirmware,
     });
 }
 
-int BrcmTestSuit::startReception(const Row& setChannel, const std::string& channel,
+int BrcmTestSuit::startReception(const Command& setChannel, const std::string& channel,
                                  const std::string& chain, std::string& out) {
-    CmdRunResult counter;
-    const int status = runTable({
+    return runTable(*this, {
         kInterfaceDown,
         kMfgFirmware,
         kInterfaceUp,
@@ -223,9 +223,7 @@ int BrcmTestSuit::startReception(const Row& setChannel, const std::string& chann
         {"wl", "rxchain", chain},
         kStartRx,
         kReadCounter,
-    }, counter);
-    out = packetCount(counter.output);
-    return status;
+    }, AfterRow{14, [&](const std::string& output) { out = packetCount(output); }});
 }
 
 // clang-format on

@@ -3,6 +3,7 @@
 
 #pragma once
 
+#include "shell/CommandTable.h"
 #include "suites/VendorTestSuit.h"
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
@@ -63,9 +64,9 @@ class BrcmTestSuit : public VendorTestSuit {
     int RunStopDriver();
 
   private:
-    /** Starts a reception on the channel that the row `setChannel` tunes to. */
-    int startReception(const Row& setChannel, const std::string& channel, const std::string& chain,
-                       std::string& out);
+    /** Starts a reception on the channel that `setChannel` tunes to. */
+    int startReception(const Command& setChannel, const std::string& channel,
+                       const std::string& chain, std::string& out);
 
     /** The packet count in the output of the counter command; empty when it printed none. */
     std::string packetCount(const std::string& output);

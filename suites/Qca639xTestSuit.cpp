@@ -44,10 +44,10 @@ std::string Qca639xTestSuit::getAxbandwidthPara(const std::string& bandwidth) {
 }
 
 std::string Qca639xTestSuit::Qca639xParseReceivedPacketNum(const std::string& output) {
-    return tests().parseReceivedPacketNum(output);
+    return operations().parseReceivedPacketNum(output);
 }
 
-DriverPathTests Qca639xTestSuit::tests() {
+DriverPathOperations Qca639xTestSuit::operations() {
     return {*this, kLogTag, kQca639xChip, driverPaths};
 }
 

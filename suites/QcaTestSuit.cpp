@@ -44,10 +44,10 @@ std::string QcaTestSuit::getAbgProtocalIndex(const std::string& rate) {
 }
 
 std::string QcaTestSuit::ParseReceivedPacketNum(const std::string& output) {
-    return tests().parseReceivedPacketNum(output);
+    return operations().parseReceivedPacketNum(output);
 }
 
-FirmwarePathTests QcaTestSuit::tests() {
+FirmwarePathOperations QcaTestSuit::operations() {
     return {*this, kLogTag, kQcaChip, FwPath};
 }
 

@@ -11,10 +11,10 @@ namespace vendor::korvan::bex::wifi::V1_0::implementation {
 namespace {
 
 struct BgRate {
-    std::string_view rate;
-    std::string_view index;
-    std::string_view protocol;
-    std::string_view name;
+    const char* rate;
+    const char* index;
+    const char* protocol;
+    const char* name;
 };
 
 // The tool's indices have gaps: 9 and 11 are no rates.
@@ -79,14 +79,14 @@ constexpr RateNames kVht80RateNames = {
 // clang-format on
 
 std::string bgRateIndex(const std::string& rate) {
-    return std::string(findBgRate(rate).index);
+    return findBgRate(rate).index;
 }
 
 std::string abgProtocolIndex(const std::string& rate) {
-    return std::string(findBgRate(rate).protocol);
+    return findBgRate(rate).protocol;
 }
 
-std::string_view bgRateName(const std::string& rate) {
+std::string bgRateName(const std::string& rate) {
     return findBgRate(rate).name;
 }
 
@@ -94,10 +94,10 @@ std::string mcsRateIndex(const std::string& mcs) {
     return std::to_string(atoi(mcs.c_str()) + kFirstMcsIndex);
 }
 
-std::string_view mcsRateName(const RateNames& names, const std::string& mcs) {
+std::string mcsRateName(const RateNames& names, const std::string& mcs) {
     const int number = atoi(mcs.c_str());
     if (number < 0 || number >= static_cast<int>(names.size())) return "";
-    return names[number];
+    return std::string(names[number]);
 }
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

@@ -19,7 +19,7 @@ std::string bgRateIndex(const std::string& rate);
 std::string abgProtocolIndex(const std::string& rate);
 
 /** The driver's name of an 802.11b/g/a rate; unknown rates give that of 1 Mbit/s. */
-std::string_view bgRateName(const std::string& rate);
+std::string bgRateName(const std::string& rate);
 
 /** myftm's rate index of an 802.11n, ac or ax rate, in decimal: they follow each other from 15 on.
  */
@@ -35,6 +35,6 @@ extern const RateNames kVht40RateNames;
 extern const RateNames kVht80RateNames;
 
 /** The name of the rate with the number `mcs`; empty when the list has no such rate. */
-std::string_view mcsRateName(const RateNames& names, const std::string& mcs);
+std::string mcsRateName(const RateNames& names, const std::string& mcs);
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

@@ -5,6 +5,10 @@
 
 #include <android/log.h>
 
+#include <utility>
+
+#include "shell/Command.h"
+
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 namespace {
@@ -78,7 +82,10 @@ VendorTestSuit::~VendorTestSuit() {
 }
 
 void VendorTestSuit::runCmdCom(const std::string& cmd, CmdRunResult& result) {
-    runCommand(cmd, kLogTag, result);
+    result = {};
+    if (std::optional<std::string> output = runCommand(cmd, kLogTag)) {
+        result = {0, std::move(*output)};
+    }
 }
 
 std::string VendorTestSuit::replaceSubString(const std::string& src, const std::string& from,
@@ -99,18 +106,6 @@ std::vector<std::string> VendorTestSuit::splitString(const std::string& str,
     }
     if (start != str.size()) pieces.emplace_back(str, start);
     return pieces;
-}
-
-int VendorTestSuit::runTable(const Table& table, CmdRunResult& result) {
-    return implementation::runTable(
-            table,
-            [this](const std::string& cmd, CmdRunResult& cmdResult) { runCmdCom(cmd, cmdResult); },
-            result);
-}
-
-int VendorTestSuit::runTable(const Table& table) {
-    CmdRunResult result;
-    return runTable(table, result);
 }
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

@@ -3,10 +3,9 @@
 
 #pragma once
 
+#include <cstdint>
 #include <string>
 #include <vector>
-
-#include "shell/CommandTable.h"
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
@@ -23,7 +22,13 @@ namespace vendor::korvan::bex::wifi::V1_0::implementation {
  */
 class VendorTestSuit {
   public:
-    using CmdRunResult = CommandResult;
+    /** What one command left behind. */
+    struct CmdRunResult {
+        /** 0 when the command ran and ended with exit status 0, else -1. */
+        int32_t status = -1;
+        /** What the command wrote to its standard output when status is 0, else empty. */
+        std::string output;
+    };
 
     VendorTestSuit();
     virtual ~VendorTestSuit();
@@ -74,7 +79,7 @@ class VendorTestSuit {
     /** Ends a reception and reads its packet count into `out`. */
     virtual int RunRxStop(const std::string& channel, std::string& out) = 0;
 
-    /** Runs one command line and collects its output; see runCommand. */
+    /** Runs one command line and collects its output in `result`; see runCommand. */
     virtual void runCmdCom(const std::string& cmd, CmdRunResult& result);
 
     /**
@@ -93,12 +98,6 @@ class VendorTestSuit {
      * in a row do: ("a  b ", " ") gives "a", "", "b". Does not end when `sep` is empty.
      */
     virtual std::vector<std::string> splitString(const std::string& str, const std::string& sep);
-
-    /** Runs a table through runCmdCom; `result` is the last command's afterwards. */
-    int runTable(const Table& table, CmdRunResult& result);
-
-    /** Runs a table whose output nobody reads. */
-    int runTable(const Table& table);
 };
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

@@ -44,10 +44,10 @@ std::string Wcn39xxTestSuit::getAbgProtocalIndex(const std::string& rate) {
 }
 
 std::string Wcn39xxTestSuit::ParseReceivedPacketNum(const std::string& output) {
-    return tests().parseReceivedPacketNum(output);
+    return operations().parseReceivedPacketNum(output);
 }
 
-FirmwarePathTests Wcn39xxTestSuit::tests() {
+FirmwarePathOperations Wcn39xxTestSuit::operations() {
     return {*this, kLogTag, kWcn39xxChip, FwPath};
 }
 

@@ -3,14 +3,14 @@
 
 #pragma once
 
-#include "suites/FirmwarePathTests.h"
+#include "suites/FirmwarePathOperations.h"
 #include "suites/VendorTestSuit.h"
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 /**
  * The radio tests of WCN39xx chips; what they have in common with QcaTestSuit is told at
- * FirmwarePathTests.
+ * FirmwarePathOperations.
  */
 class Wcn39xxTestSuit : public VendorTestSuit {
   public:
@@ -19,52 +19,52 @@ class Wcn39xxTestSuit : public VendorTestSuit {
 
     int RunTxBGStart(const std::string& channel, const std::string& rate, const std::string& power,
                      const std::string& antenna) override {
-        return tests().RunTxBGStart(channel, rate, power, antenna);
+        return operations().RunTxBGStart(channel, rate, power, antenna);
     }
     int RunTxNStart(const std::string& channel, const std::string& bandwidth,
                     const std::string& mcs, const std::string& power, bool vht,
                     const std::string& antenna) override {
-        return tests().RunTxNStart(channel, bandwidth, mcs, power, vht, antenna);
+        return operations().RunTxNStart(channel, bandwidth, mcs, power, vht, antenna);
     }
 
     /** Leaves the driver in test mode only: it transmits nothing and uses no argument. */
     int RunTxAxStart(const std::string&, const std::string&, const std::string&, const std::string&,
                      const std::string&, const std::string&) override {
-        return tests().RunTxAxStart();
+        return operations().RunTxAxStart();
     }
 
     /** Does not use `bandwidth`. */
     int RunTxStStart(const std::string& channel, const std::string& /*bandwidth*/,
                      const std::string& antenna) override {
-        return tests().RunTxStStart(channel, antenna);
+        return operations().RunTxStStart(channel, antenna);
     }
 
     /** Is RunTxStop, also where a subclass has its own. */
     int RunTxStStop(const std::string& channel) override { return RunTxStop(channel); }
-    int RunTxStop(const std::string& /*channel*/) override { return tests().RunTxStop(); }
+    int RunTxStop(const std::string& /*channel*/) override { return operations().RunTxStop(); }
     int RunRxApJoinHoc(const std::string& ssid, const std::string& address) override {
-        return tests().RunRxApJoinHoc(ssid, address);
+        return operations().RunRxApJoinHoc(ssid, address);
     }
 
     // The starts of a reception leave "ok" or "failure" in `out`.
     int RunRxBgStart(const std::string& channel, const std::string& rate,
                      const std::string& antenna, std::string& out) override {
-        return tests().RunRxBgStart(channel, rate, antenna, out);
+        return operations().RunRxBgStart(channel, rate, antenna, out);
     }
     int RunRxNStart(std::string channel, const std::string& bandwidth, const std::string& mcs,
                     bool vht, const std::string& antenna, std::string& out) override {
-        return tests().RunRxNStart(channel, bandwidth, mcs, vht, antenna, out);
+        return operations().RunRxNStart(channel, bandwidth, mcs, vht, antenna, out);
     }
 
     /** Prepares the driver as RunTxAxStart does: it receives nothing and uses no argument. */
     int RunRxAxStart(const std::string&, const std::string&, const std::string&, const std::string&,
                      std::string& out) override {
-        return tests().RunRxAxStart(out);
+        return operations().RunRxAxStart(out);
     }
 
     /** Leaves "Rx: " and the packet count in `out`. */
     int RunRxStop(const std::string& /*channel*/, std::string& out) override {
-        return tests().RunRxStop(out);
+        return operations().RunRxStop(out);
     }
 
     /** Looks for the driver's module file, for all suites of this class; see findFwPath. */
@@ -80,8 +80,8 @@ class Wcn39xxTestSuit : public VendorTestSuit {
     std::string ParseReceivedPacketNum(const std::string& output);
 
   private:
-    /** The tables that this chip's tests are made from. */
-    FirmwarePathTests tests();
+    /** The operations of the family, as this chip has them. */
+    FirmwarePathOperations operations();
 };
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

@@ -44,10 +44,10 @@ std::string Wcn6750TestSuit::getAxbandwidthPara(const std::string& bandwidth) {
 }
 
 std::string Wcn6750TestSuit::Wcn6750ParseReceivedPacketNum(const std::string& output) {
-    return tests().parseReceivedPacketNum(output);
+    return operations().parseReceivedPacketNum(output);
 }
 
-DriverPathTests Wcn6750TestSuit::tests() {
+DriverPathOperations Wcn6750TestSuit::operations() {
     return {*this, kLogTag, kWcn6750Chip, driverPaths};
 }
 

@@ -3,14 +3,14 @@
 
 #pragma once
 
-#include "suites/DriverPathTests.h"
+#include "suites/DriverPathOperations.h"
 #include "suites/VendorTestSuit.h"
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 /**
  * The radio tests of the WCN6750; what they have in common with Qca639xTestSuit is told at
- * DriverPathTests. Uses every argument but one.
+ * DriverPathOperations. Uses every argument but one.
  */
 class Wcn6750TestSuit : public VendorTestSuit {
   public:
@@ -19,50 +19,50 @@ class Wcn6750TestSuit : public VendorTestSuit {
 
     int RunTxBGStart(const std::string& channel, const std::string& rate, const std::string& power,
                      const std::string& antenna) override {
-        return tests().RunTxBGStart(channel, rate, power, antenna);
+        return operations().RunTxBGStart(channel, rate, power, antenna);
     }
     int RunTxNStart(const std::string& channel, const std::string& bandwidth,
                     const std::string& mcs, const std::string& power, bool vht,
                     const std::string& antenna) override {
-        return tests().RunTxNStart(channel, bandwidth, mcs, power, vht, antenna);
+        return operations().RunTxNStart(channel, bandwidth, mcs, power, vht, antenna);
     }
     int RunTxAxStart(const std::string& channel, const std::string& bandwidth,
                      const std::string& mcs, const std::string& power,
                      const std::string& guardInterval, const std::string& antenna) override {
-        return tests().RunTxAxStart(channel, bandwidth, mcs, power, guardInterval, antenna);
+        return operations().RunTxAxStart(channel, bandwidth, mcs, power, guardInterval, antenna);
     }
 
     /** Does not use `bandwidth`. */
     int RunTxStStart(const std::string& channel, const std::string& /*bandwidth*/,
                      const std::string& antenna) override {
-        return tests().RunTxStStart(channel, antenna);
+        return operations().RunTxStStart(channel, antenna);
     }
 
     /** Is RunTxStop, also where a subclass has its own. */
     int RunTxStStop(const std::string& channel) override { return RunTxStop(channel); }
-    int RunTxStop(const std::string& channel) override { return tests().RunTxStop(channel); }
+    int RunTxStop(const std::string& channel) override { return operations().RunTxStop(channel); }
     int RunRxApJoinHoc(const std::string& ssid, const std::string& address) override {
-        return tests().RunRxApJoinHoc(ssid, address);
+        return operations().RunRxApJoinHoc(ssid, address);
     }
 
     // The starts of a reception leave "ok" or "failure" in `out`.
     int RunRxBgStart(const std::string& channel, const std::string& rate,
                      const std::string& antenna, std::string& out) override {
-        return tests().RunRxBgStart(channel, rate, antenna, out);
+        return operations().RunRxBgStart(channel, rate, antenna, out);
     }
     int RunRxNStart(std::string channel, const std::string& bandwidth, const std::string& mcs,
                     bool vht, const std::string& antenna, std::string& out) override {
-        return tests().RunRxNStart(channel, bandwidth, mcs, vht, antenna, out);
+        return operations().RunRxNStart(channel, bandwidth, mcs, vht, antenna, out);
     }
     int RunRxAxStart(const std::string& channel, const std::string& bandwidth,
                      const std::string& mcs, const std::string& antenna,
                      std::string& out) override {
-        return tests().RunRxAxStart(channel, bandwidth, mcs, antenna, out);
+        return operations().RunRxAxStart(channel, bandwidth, mcs, antenna, out);
     }
 
     /** Leaves "Rx: " and the packet count in `out`. */
     int RunRxStop(const std::string& channel, std::string& out) override {
-        return tests().RunRxStop(channel, out);
+        return operations().RunRxStop(channel, out);
     }
 
     /** Adds the driver's module files to driverPaths; see listDriverPaths. Returns 0 or -1. */
@@ -84,8 +84,8 @@ class Wcn6750TestSuit : public VendorTestSuit {
     std::vector<std::string> driverPaths;
 
   private:
-    /** The tables that this chip's tests are made from. */
-    DriverPathTests tests();
+    /** The operations of the family, as this chip has them. */
+    DriverPathOperations operations();
 };
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

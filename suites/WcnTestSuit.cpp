@@ -6,6 +6,7 @@
 #include <android/log.h>
 #include <stdlib.h>
 
+#include "shell/CommandTable.h"
 #include "suites/DriverModules.h"
 #include "suites/Rates.h"
 #include "suites/Reception.h"
@@ -21,17 +22,17 @@ std::string FwPath;
 
 // The rows that the operations share. The single tone names the driver without its ending.
 // clang-format off
-constexpr Row kEndTest      = {"iwpriv wlan0", "ftm 0"};
-constexpr Row kBeginTest    = {"iwpriv wlan0", "ftm 1"};
-constexpr Row kUnload       = {"rmmod", "wlan.ko"};
-constexpr Row kUnloadByTone = {"rmmod", "wlan"};
-constexpr Row kReadCounter  = {"iwpriv wlan0", "get_rxpktcnt"};
+const Command kEndTest      = {"iwpriv wlan0", "ftm 0"};
+const Command kBeginTest    = {"iwpriv wlan0", "ftm 1"};
+const Command kUnload       = {"rmmod", "wlan.ko"};
+const Command kUnloadByTone = {"rmmod", "wlan"};
+const Command kReadCounter  = {"iwpriv wlan0", "get_rxpktcnt"};
 
 /** How the driver is told an 802.11n or ac channel: its bonding word and its rates. */
 struct BondedChannel {
     bool vht;
     int mhz;
-    std::string_view bonding;
+    const char* bonding;
     const RateNames& rates;
 };
 
@@ -55,11 +56,11 @@ const BondedChannel& bondedChannel(const std::string& bandwidth, bool vht) {
 }
 
 /** Loads the driver in factory test mode. */
-Row loadForTest() {
+Command loadForTest() {
     return {"insmod", FwPath, "con_mode=5"};
 }
 
-Row loadNormally() {
+Command loadNormally() {
     return {"insmod", FwPath};
 }
 
@@ -81,7 +82,7 @@ WcnTestSuit::~WcnTestSuit() {
 
 int WcnTestSuit::RunTxBGStart(const std::string& channel, const std::string& rate,
                               const std::string& power, const std::string&) {
-    return runTable({
+    return runTable(*this, {
         kEndTest,
         kUnload,
         loadForTest(),
@@ -99,7 +100,7 @@ int WcnTestSuit::RunTxNStart(const std::string& channel, const std::string& band
                              const std::string& mcs, const std::string& power, bool vht,
                              const std::string&) {
     const BondedChannel& bonded = bondedChannel(bandwidth, vht);
-    return runTable({
+    return runTable(*this, {
         kEndTest,
         kUnload,
         loadForTest(),
@@ -121,13 +122,13 @@ int WcnTestSuit::RunTxAxStart(const std::string&, const std::string&, const std:
 
 int WcnTestSuit::RunTxStStart(const std::string& channel, const std::string& bandwidth,
                               const std::string&) {
-    return runTable({
+    return runTable(*this, {
         kUnloadByTone,
         loadForTest(),
         kBeginTest,
         // A tone is bonded as 802.11ac is, whatever the test before it was.
         {"iwpriv wlan0", "set_cb", bondedChannel(bandwidth, true).bonding},
-        {"iwpriv wlan0", "set_channel", channel.empty() ? "1" : std::string_view(channel)},
+        {"iwpriv wlan0", "set_channel", channel.empty() ? "1" : channel},
         {"iwpriv wlan0", "ena_chain 2"},
         {"iwpriv wlan0", "set_tx_wf_gain 0 1"},
         {"iwpriv wlan0", "tx_cw_rf_gen 1"},
@@ -135,7 +136,7 @@ int WcnTestSuit::RunTxStStart(const std::string& channel, const std::string& ban
 }
 
 int WcnTestSuit::RunTxStStop(const std::string&) {
-    return runTable({
+    return runTable(*this, {
         {"iwpriv wlan0", "tx_cw_rf_gen 0"},
         kEndTest,
         kUnloadByTone,
@@ -144,13 +145,13 @@ int WcnTestSuit::RunTxStStop(const std::string&) {
 }
 
 int WcnTestSuit::RunTxStop(const std::string&) {
-    return runTable({
+    return runTable(*this, {
         {"iwpriv wlan0", "tx 0"},
     });
 }
 
 int WcnTestSuit::RunRxApJoinHoc(const std::string& ssid, const std::string& address) {
-    return runTable({
+    return runTable(*this, {
         kEndTest,
         kUnload,
         loadNormally(),
@@ -166,8 +167,7 @@ int WcnTestSuit::RunRxApJoinHoc(const std::string& ssid, const std::string& addr
 
 int WcnTestSuit::RunRxBgStart(const std::string& channel, const std::string&, const std::string&,
                               std::string& out) {
-    CmdRunResult counter;
-    const int status = runTable({
+    return runTable(*this, {
         kEndTest,
         kUnload,
         loadForTest(),
@@ -178,9 +178,7 @@ int WcnTestSuit::RunRxBgStart(const std::string& channel, const std::string&, co
         {"iwpriv wlan0", "clr_rxpktcnt 1"},
         {"iwpriv wlan0", "rx 1"},
         kReadCounter,
-    }, counter);
-    out = packetCount(counter.output);
-    return status;
+    }, AfterRow{10, [&](const std::string& output) { out = packetCount(output); }});
 }
 
 int WcnTestSuit::RunRxNStart(std::string channel, const std::string&, const std::string& mcs, bool,
@@ -196,19 +194,16 @@ int WcnTestSuit::RunRxAxStart(const std::string&, const std::string&, const std:
 }
 
 int WcnTestSuit::RunRxStop(const std::string&, std::string& out) {
-    CmdRunResult counter;
-    const int counted = runTable({kReadCounter}, counter);
-    out = packetCount(counter.output);
-    const int ended = runTable({
+    return runTable(*this, {
+        kReadCounter,
         kEndTest,
         kUnload,
         loadNormally(),
-    });
-    return counted == 0 && ended == 0 ? 0 : -1;
+    }, AfterRow{1, [&](const std::string& output) { out = packetCount(output); }});
 }
 
 int WcnTestSuit::enterTestMode() {
-    return runTable({
+    return runTable(*this, {
         kEndTest,
         kUnload,
         loadForTest(),

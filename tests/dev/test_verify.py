@@ -123,10 +123,10 @@ def test_what_the_board_includes(copy, old, new, told):
 
 def test_a_source_that_soong_lacks(copy):
     file = copy / "shell/Android.bp"
-    file.write_text(file.read_text().replace('        "CommandList.cpp",\n', ""))
+    file.write_text(file.read_text().replace('        "CommandTable.cpp",\n', ""))
     told = verify(copy).stderr
-    assert "shell/CommandList.cpp:1: is in no module of shell/Android.bp" in told
-    assert "shell/CMakeLists.txt:1: Soong does not build shell/CommandList.cpp" in told
+    assert "shell/CommandTable.cpp:1: is in no module of shell/Android.bp" in told
+    assert "shell/CMakeLists.txt:1: Soong does not build shell/CommandTable.cpp" in told
 
 
 def test_a_source_that_cmake_lacks(copy):

@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: Apache-2.0
 
 #include "sniffer/SnifferTool.h"
+#include "suites/VendorTestSuit.h"
 #include "tests/unit/Expect.h"
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
@@ -130,11 +131,26 @@ TEST_F(SnifferToolTest, AnUnreadableModeCountsAsMonitorMode) {
 }
 
 TEST_F(SnifferToolTest, RunsCommandsUnderItsTag) {
-    SnifferTool::CmdRunResult result;
-    mShell.answer("false", failing());
+    SnifferTool::CmdRunResult result = {0, "left over"};
+    mShell.answer("false", failing("text"));
     mTool.runCmdCom("false ", result);
     EXPECT_EQ(-1, result.status);
-    EXPECT_THAT(mShell.log(), ElementsAre(error(kTag, "cmd: \"false \" unsuccessful execution")));
+    EXPECT_EQ("", result.output);
+    EXPECT_THAT(mShell.log(), ElementsAre(debug(kTag, "text"),
+                                          error(kTag, "cmd: \"false \" unsuccessful execution")));
+}
+
+const char* ownerOf(const VendorTestSuit::CmdRunResult&) {
+    return "VendorTestSuit";
+}
+
+const char* ownerOf(const SnifferTool::CmdRunResult&) {
+    return "SnifferTool";
+}
+
+TEST(CmdRunResultTest, IsARecordOfItsClass) {
+    EXPECT_STREQ("VendorTestSuit", ownerOf(VendorTestSuit::CmdRunResult{0, "text"}));
+    EXPECT_STREQ("SnifferTool", ownerOf(SnifferTool::CmdRunResult{0, "text"}));
 }
 
 } // namespace

@@ -50,6 +50,18 @@ TEST(VendorTestSuitTest, RunsCommandsUnderItsTag) {
                                          debug(kTag, "cmd: \"wl ver\" successful execution")));
 }
 
+TEST(VendorTestSuitTest, OverwritesTheResultOfAnotherCommand) {
+    RecordedShell shell;
+    BareSuit suit;
+    for (const RecordedShell::Answer& answer : {failing("text\n"), {"", 0, false}}) {
+        shell.answer("wl", answer);
+        VendorTestSuit::CmdRunResult result = {0, "left over"};
+        suit.runCmdCom("wl ver", result);
+        EXPECT_EQ(-1, result.status);
+        EXPECT_EQ("", result.output);
+    }
+}
+
 TEST(VendorTestSuitTest, ReplacesEveryOccurrence) {
     BareSuit suit;
     EXPECT_EQ("a b c", suit.replaceSubString("a-b-c", "-", " "));

@@ -4,10 +4,9 @@
 #pragma once
 
 #include <string>
-#include <string_view>
 #include <vector>
 
-#include "shell/CommandList.h"
+#include "shell/CommandTable.h"
 #include "suites/VendorTestSuit.h"
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
@@ -31,24 +30,24 @@ inline constexpr DriverPathChip kWcn6750Chip = {"-B phya",  "0",     "0",    "-x
 // clang-format on
 
 /**
- * The radio tests of chips whose driver is every module file of the family, through the myftm tool:
- * a start reloads them in factory test mode and runs one myftm command, a stop reloads them
+ * The operations of a suite whose chips have a driver of several module files and the tool myftm: a
+ * start reloads all of them in factory test mode and runs one myftm command, a stop reloads them
  * normally.
  *
- * Runs everything through the suite that makes it, which has operations of the same names, and logs
- * every line under that name. A module that does not load fails no operation but RunRxStop.
+ * Every line runs through the suite, which has operations of the same names, and is logged under
+ * that name. A module that cannot be loaded fails RunRxStop only.
  */
-class DriverPathTests {
+class DriverPathOperations {
   public:
     /**
-     * @param suit The suite that these are the tests of. Outlives this object.
+     * @param suit The suite whose operations these are. Outlives this object.
      * @param tag The suite's log tag.
      * @param chip Lives for the whole process.
      * @param driverPaths The driver's module files, in the order in which they load. Outlives this
      *     object.
      */
-    DriverPathTests(VendorTestSuit& suit, const char* tag, const DriverPathChip& chip,
-                    const std::vector<std::string>& driverPaths);
+    DriverPathOperations(VendorTestSuit& suit, const char* tag, const DriverPathChip& chip,
+                         const std::vector<std::string>& driverPaths);
 
     int RunTxBGStart(const std::string& channel, const std::string& rate, const std::string& power,
                      const std::string& antenna);
@@ -76,20 +75,20 @@ class DriverPathTests {
     /** The value of -I. */
     const char* bandFlag(const std::string& channel) const;
 
-    /** Unloads the driver and loads its modules, with a parameter unless that is empty. */
-    int reload(const char* method, std::string_view insmod, std::string_view parameter);
+    /** The commands that reload the driver in factory test mode and bring the interface up. */
+    CommandTable testMode() const;
 
-    /** Reloads the driver in factory test mode and brings the interface up. */
-    int enterTestMode(const char* method);
+    /** The commands that end the test by the option `end` and reload the driver normally. */
+    CommandTable endAndReload(const std::string& channel, const char* end,
+                              const char* insmod) const;
 
     /** Enters test mode and runs one myftm command. */
-    int start(const char* method, const Tokens& test);
+    int start(const char* method, const Command& test);
 
-    /** The same, and says in `out` how it went. */
-    int startReception(const char* method, const Tokens& test, std::string& out);
+    /** The same for a reception, with "ok" or "failure" in `out`. */
+    int startReception(const char* method, const Command& test, std::string& out);
 
-    int run(const char* method, const CommandList& list, VendorTestSuit::CmdRunResult& result);
-    int run(const char* method, const CommandList& list);
+    int runCommandList(const char* method, const CommandTable& list, const AfterRow& after = {});
 
     VendorTestSuit& mSuit;
     const char* const mTag;

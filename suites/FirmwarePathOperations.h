@@ -4,15 +4,15 @@
 #pragma once
 
 #include <string>
-#include <string_view>
 
+#include "shell/CommandTable.h"
 #include "suites/VendorTestSuit.h"
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 /** The tools of a phone, as its shell finds them. */
 struct FirmwarePathTools {
-    std::string_view myftm, rmmod, insmod, sleep, ifconfig, iwlist, iwconfig, ping;
+    const char *myftm, *rmmod, *insmod, *sleep, *ifconfig, *iwlist, *iwconfig, *ping;
 };
 
 /** How the driver's module is loaded. */
@@ -36,37 +36,39 @@ struct FirmwarePathChip {
     DriverLoad testLoad;
     /** How it is loaded for joining a network and for 802.11ax, where no test command follows. */
     DriverLoad idleLoad;
-    /** What ends the running test before an 802.11b/g transmission, and that one's options. */
-    std::string_view bgEnd;
-    Row (*bgOptions)(const BgTransmission& test);
-    /** The option in front of the antenna in an 802.11n transmission. */
-    std::string_view nAntenna;
-    /** What follows the address when joining a network; empty: nothing. */
-    std::string_view addressUp;
+    /** The option that ends the running test before an 802.11b/g transmission. */
+    const char* bgEnd;
+    /** The command of an 802.11b/g transmission. */
+    Command (*bgTest)(const BgTransmission& test);
+    /** The option before the antenna in an 802.11n transmission. */
+    const char* nAntenna;
+    /** The word after the address when joining a network; may be empty. */
+    const char* addressUp;
 };
 
-// What each chip has there stands side by side in FirmwarePathTests.cpp.
+// What each chip has there stands side by side in FirmwarePathOperations.cpp.
 extern const FirmwarePathChip kQcaChip;
 extern const FirmwarePathChip kWcn39xxChip;
 
 /**
- * The radio tests of chips whose driver is one module file, through the myftm tool: a start reloads
- * the driver in factory test mode and runs one myftm command, a stop reloads it normally.
+ * The operations of a suite whose chips have a driver of one module file and the tool myftm: a
+ * start reloads the driver in factory test mode and runs one myftm command, a stop reloads it
+ * normally.
  *
- * Runs everything through the suite that makes it, which has operations of the same names. myftm
- * has two commands that end what runs: -t 0 is for transmissions, -x 0 for receptions.
+ * Every line runs through the suite, which has operations of the same names. myftm has two commands
+ * that end a test: -t 0 is for transmissions, -x 0 for receptions.
  */
-class FirmwarePathTests {
+class FirmwarePathOperations {
   public:
     /**
-     * @param suit The suite that these are the tests of. Outlives this object.
+     * @param suit The suite whose operations these are. Outlives this object.
      * @param tag The suite's log tag.
      * @param chip Lives for the whole process.
-     * @param fwPath The driver's module file; empty while there is none, which ends the command
-     * that should load it. Outlives this object.
+     * @param fwPath The driver's module file; empty when there is none, which ends the command that
+     *     loads it. Outlives this object.
      */
-    FirmwarePathTests(VendorTestSuit& suit, const char* tag, const FirmwarePathChip& chip,
-                      const std::string& fwPath);
+    FirmwarePathOperations(VendorTestSuit& suit, const char* tag, const FirmwarePathChip& chip,
+                           const std::string& fwPath);
 
     int RunTxBGStart(const std::string& channel, const std::string& rate, const std::string& power,
                      const std::string& antenna);
@@ -88,11 +90,11 @@ class FirmwarePathTests {
     std::string parseReceivedPacketNum(const std::string& output);
 
   private:
-    /** The row of a myftm command. */
-    Row myftm(const Row& options) const;
+    /** Ends the running test, reloads the driver and runs the commands of the next test. */
+    int run(const char* end, DriverLoad load, const CommandTable& test);
 
-    /** Ends the running test, loads the driver afresh and runs the rows behind that. */
-    int run(std::string_view end, DriverLoad load, const Table& rows);
+    /** The same for a reception, with "ok" or "failure" in `out`. */
+    int startReception(DriverLoad load, const CommandTable& test, std::string& out);
 
     VendorTestSuit& mSuit;
     const char* const mTag;
