@@ -16,6 +16,7 @@ import sys
 import time
 
 from launcher.errors import PhoneError
+from launcher.inside import Folder
 from launcher.process import Sandbox
 from launcher.sandbox import chosen_kind, socket_folder
 
@@ -35,21 +36,21 @@ def up(folder, boot):
         print(f"phone: {folder} is up already", file=sys.stderr)
         return
     kind = chosen_kind(folder)
-    sockets = socket_folder(kind, folder)
-    os.makedirs(f"{sockets}/hidl", 0o700, exist_ok=True)
+    place, path = socket_folder(kind, folder)
+    sockets = Folder(place, f"{path}/hidl", make=True)
     command = ["/system/bin/sh", "/phone/lib/init", "boot" if boot else "again", SERVICE]
     sandbox = Sandbox(kind, folder, command)  # a refusal shows here, not in the log
-    for path in _registered(sockets):
-        os.remove(path)
+    for name in _registered(sockets):
+        sockets.remove(name)
     keeper = os.fork()
     if keeper == 0:
-        _keep(folder, boot, sockets, sandbox)
+        _keep(folder, boot, kind, sandbox)
     os.ftruncate(lock, 0)
     os.write(lock, f"{keeper}\n".encode())
     _await_service(folder, sockets, keeper)
 
 
-def _keep(folder, boot, sockets, sandbox):
+def _keep(folder, boot, kind, sandbox):
     """The keeper: never returns."""
     status = 125
     try:
@@ -61,7 +62,7 @@ def _keep(folder, boot, sockets, sandbox):
         sandbox.streams = [nothing, log, log]
         status = sandbox.hold()
     finally:
-        _remove_borrowed(folder, sockets)
+        _remove_borrowed(kind, folder)
         os._exit(status)
 
 
@@ -87,18 +88,15 @@ def _await_service(folder, sockets, keeper):
 
 def _registered(sockets):
     """The sockets of what is registered. A hidden one is not ready yet."""
-    try:
-        with os.scandir(f"{sockets}/hidl") as entries:
-            return [entry.path for entry in entries if not entry.name.startswith(".")
-                    and stat.S_ISSOCK(entry.stat(follow_symlinks=False).st_mode)]
-    except FileNotFoundError:  # the keeper has ended and taken it away
-        return []
+    return [name for name in sockets.names()
+            if not name.startswith(".") and sockets.kind(name) == stat.S_IFSOCK]
 
 
-def _remove_borrowed(folder, sockets):
+def _remove_borrowed(kind, folder):
     """Removes a folder for sockets that is not the phone's own."""
-    if not sockets.startswith(folder):
-        shutil.rmtree(sockets, ignore_errors=True)
+    place, path = socket_folder(kind, folder)
+    if place == "/tmp":
+        shutil.rmtree(f"{place}/{path}", ignore_errors=True)  # follows no link
 
 
 def down(folder):
@@ -106,7 +104,7 @@ def down(folder):
     if not _end_keeper(folder):
         print(f"phone: {folder} is not up", file=sys.stderr)
     # The keeper removes it, unless it was killed.
-    _remove_borrowed(folder, socket_folder(chosen_kind(folder), folder))
+    _remove_borrowed(chosen_kind(folder), folder)
 
 
 def restart_service(folder):

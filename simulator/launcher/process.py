@@ -7,9 +7,9 @@
     sandbox     bwrap or proot, in another session
     inside      under bwrap in one more, under proot in the sandbox's
 
-So no process group reaches from inside out, and what runs inside has no controlling terminal that it
-could type into. The holder ends every child that it has; those that the launcher's caller may have
-left to the launcher are not among them. The keeper of a phone that is on is a holder, too.
+So no process group reaches from inside out, and what runs inside has no controlling terminal that
+it could type into. The holder ends every child that it has; those that the launcher's caller may
+have left to the launcher are not among them. The keeper of a phone that is on is a holder, too.
 """
 
 import ctypes

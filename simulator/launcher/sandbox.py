@@ -13,8 +13,10 @@ Both die with the process that started them; process.py does the rest.
 """
 
 import os
+import stat
 
 from launcher.errors import PhoneError
+from launcher.inside import Folder
 
 ENVIRONMENT = {
     # As the service's init script sets it.
@@ -57,16 +59,17 @@ def command_line(kind, folder):
 
 
 def socket_folder(kind, folder):
-    """Where the phone's /dev/socket lies on this machine.
+    """Where the phone's /dev/socket lies on this machine: a folder, and the path below it, on which
+    no link is to be followed.
 
     proot hands the machine's path of a socket to the kernel, which takes 107 bytes of it. Where the
     phone's folder is too deep for that, the sockets lie in a folder in /tmp while the phone is up.
     """
-    usual = os.path.join(folder, "root/dev/socket")
-    if kind == "bwrap" or len(usual) <= LONGEST_SOCKET_FOLDER:
-        return usual
-    identity = os.stat(usual)
-    return f"/tmp/bex-phone-{identity.st_dev:x}-{identity.st_ino:x}"
+    root = os.path.join(folder, "root")
+    if kind == "bwrap" or len(root) + len("/dev/socket") <= LONGEST_SOCKET_FOLDER:
+        return root, "dev/socket"
+    identity = os.stat(folder)
+    return "/tmp", f"bex-phone-{identity.st_dev:x}-{identity.st_ino:x}"
 
 
 def _program(name):
@@ -79,13 +82,17 @@ def _program(name):
 
 def _borrowed_devices(root):
     """The devices that the phone has no node of its own for: the machine's own are bound."""
-    return [f"/dev/{name}" for name in DEVICES if os.path.isfile(f"{root}/dev/{name}")]
+    folder = Folder(root, "dev")
+    return [f"/dev/{name}" for name in DEVICES if folder.kind(name) == stat.S_IFREG]
 
 
 def _bwrap(_folder, root):
     line = [_program("bwrap"), "--unshare-all", "--unshare-user", "--uid", "0", "--gid", "0",
             "--cap-drop", "ALL", "--hostname", "localhost", "--die-with-parent",
             "--new-session", "--dev-bind", root, "/"]
+    # bwrap follows links to where it mounts. What is mounted on cannot be replaced inside.
+    Folder(root, "proc")
+    line += ["--dev-bind", f"{root}/dev", "/dev"]
     for device in _borrowed_devices(root):
         line += ["--dev-bind", device, device]
     return line + ["--proc", "/proc", "--remount-ro", "/proc", "--chdir", "/"]
@@ -102,11 +109,11 @@ def _proot(folder, root):
                              "cannot be dropped here (CAP_SETPCAP is missing)")
         line += ["--bounding-set", "-all"]
     line += [_program("proot"), "-v", "-1", "-r", root, "-w", "/"]
-    sockets = socket_folder("proot", folder)
-    if not sockets.startswith(root) and os.path.isdir(sockets):
-        if os.lstat(sockets).st_uid != os.geteuid():
-            raise PhoneError(f"{sockets} belongs to another user")
-        line += ["-b", f"{sockets}:/dev/socket"]
+    place, sockets = socket_folder("proot", folder)
+    if place != root and os.path.isdir(f"{place}/{sockets}"):
+        if os.fstat(Folder(place, sockets).fd).st_uid != os.geteuid():
+            raise PhoneError(f"{place}/{sockets} belongs to another user")
+        line += ["-b", f"{place}/{sockets}:/dev/socket"]
     for device in _borrowed_devices(root):
         line += ["-b", device]
     return line

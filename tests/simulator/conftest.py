@@ -100,7 +100,7 @@ class Phone:
 
     def borrowed_folder(self):
         """Where proot keeps the sockets of a phone in a deep folder."""
-        status = (self.root / "dev/socket").stat()
+        status = self.folder.stat()
         return pathlib.Path(f"/tmp/bex-phone-{status.st_dev:x}-{status.st_ino:x}")
 
     def sleepers(self):

@@ -8,7 +8,7 @@ import subprocess
 
 import pytest
 
-from conftest import wait_until
+from conftest import Launcher, wait_until
 
 TOOLS = ("busybox", "cat", "getprop", "ifconfig", "iw", "setprop", "sleep", "wl")
 
@@ -110,7 +110,7 @@ def test_clear_lets_waiting_tools_go_on(phone):
 
 
 @pytest.mark.parametrize("actions", [
-    ("explode",), ("exit",), ("exit", "256"), ("exit", "x"), ("exit", "-1"), ("signal", "0"),
+    ("explode",), ("exit",), ("exit", "256"), ("exit", "x"), ("exit", "-1"), ("exit", "1" * 5000), ("signal", "0"),
     ("signal", "65"), ("sleep", "-1"), ("sleep", "long"), ("print", "/nonesuch"), ("print", "/tmp"),
     ("clear", "now"), ("missing", "exit", "3")])
 def test_a_bad_action_changes_nothing(phone, actions):
@@ -119,6 +119,26 @@ def test_a_bad_action_changes_nothing(phone, actions):
     assert result.returncode == 1
     assert result.stderr.startswith("phone: fault wl: ") and result.stderr.count("\n") == 1
     assert phone.run("wl").returncode == 3
+
+
+@pytest.mark.parametrize("staged", [("exit", 3), ("missing",), ("--when", "up", "exit", 3)])
+def test_a_fault_that_finds_no_room_changes_nothing(phone, place, staged):
+    """A limit on the size of files, as this user has no full disk."""
+    (place / "bytes").write_bytes(b"x" * 100_000)
+    phone.fault("wl", *staged)
+    before = sorted(os.listdir(phone.root / "phone/faults")), phone.run("wl", "up").returncode
+    limited = Launcher(phone.launcher.line[-1], phone.launcher.kind, phone.launcher.user)
+    limited.line = ["prlimit", "--fsize=50000", *limited.line]
+    result = limited("fault", phone.folder, "wl", "wait", "print", place / "bytes", "exit", 4)
+    assert (result.returncode, result.stderr) \
+        == (1, f"phone: {phone.root}/phone/faults/wl: File too large\n")
+    assert before == (sorted(os.listdir(phone.root / "phone/faults")),
+                      phone.run("wl", "up").returncode)
+
+
+def test_a_pattern_may_hold_any_bytes(phone):
+    phone.fault("wl", "--when", b"\xff*".decode(errors="surrogateescape"), "exit", 5)
+    assert phone.shell("wl $'\\xff'; echo $?; wl up; echo $?").stdout == "5\n1\n"
 
 
 @pytest.mark.parametrize("tool", ["nonesuch", "", "../wl", "ls", "sh"])
