@@ -17,9 +17,11 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include "host/src/Channel.h"
+#include "host/src/Closing.h"
 #include "host/src/Connection.h"
 #include "host/src/Engine.h"
 #include "host/src/TransactionBuffer.h"
@@ -40,6 +42,7 @@ using android::base::unique_fd;
 using android::hardware::BHwBinder;
 using android::hardware::hidl_string;
 using android::hardware::Parcel;
+using android::hardware::host::closingElsewhere;
 using android::hardware::host::Connection;
 using android::hardware::host::Engine;
 using android::hardware::host::FrameHeader;
@@ -321,6 +324,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     const size_t before = openDescriptors();
     void (*const subjects[])(Input&) = {fuzzConnection, fuzzReader, fuzzRules};
     input.oneOf(subjects)(input);
+    while (closingElsewhere() != 0) std::this_thread::yield();
     check(openDescriptors() == before, "every descriptor is closed",
           std::to_string(openDescriptors()));
     check(static_cast<bool>(Reservation(android::hardware::host::kTransactionBufferSize)),
