@@ -28,13 +28,25 @@ uint64_t carriedLength(const BufferObject& object) {
     return object.buffer == 0 ? 0 : object.length;
 }
 
-/** Whether the parent is an earlier object, of `count` so far, and the address fits into it. */
+/**
+ * Whether the parent is an earlier object, of `count` so far, and the address fits into it. As for
+ * the driver of a phone, the parent is the object before or one of its ancestors, and the places in
+ * a parent ascend: no address is written twice.
+ */
 bool hasValidParent(const BufferObject& object, const uint8_t* data, const uint32_t* offsets,
                     size_t count) {
     if (object.hasParent == 0) return true;
     if (object.parent >= count) return false;
     const uint64_t room = carriedLength(objectAt(data, offsets[object.parent]));
-    return room >= sizeof(uint64_t) && object.parentOffset <= room - sizeof(uint64_t);
+    if (room < sizeof(uint64_t) || object.parentOffset > room - sizeof(uint64_t)) return false;
+    uint64_t lowest = 0;
+    for (size_t last = count - 1; last != object.parent;) {
+        const BufferObject before = objectAt(data, offsets[last]);
+        if (before.hasParent == 0) return false;
+        lowest = before.parentOffset + sizeof(uint64_t);
+        last = before.parent;
+    }
+    return object.parentOffset >= lowest;
 }
 
 } // namespace

@@ -106,6 +106,10 @@ status_t Parcel::writeBuffer(const void* buffer, size_t length, size_t* handle) 
 
 status_t Parcel::writeEmbeddedBuffer(const void* buffer, size_t length, size_t* handle,
                                      size_t parentHandle, size_t parentOffset) {
+    if (parentHandle >= mObjects.size()) return BAD_VALUE;
+    const host::BufferObject parent = host::objectAt(mData.data(), mObjects[parentHandle]);
+    if (parent.length < sizeof(uint64_t)) return BAD_VALUE;
+    if (parentOffset > parent.length - sizeof(uint64_t)) return BAD_VALUE;
     return writeObject(buffer, length, handle, true, parentHandle, parentOffset);
 }
 
@@ -128,13 +132,13 @@ status_t Parcel::writeObject(const void* buffer, size_t length, size_t* handle, 
 
 status_t Parcel::readBuffer(size_t size, size_t* handle, const void** buffer) const {
     status_t result = readObject(size, handle, false, 0, 0, buffer);
-    return result == OK && *buffer == nullptr ? BAD_VALUE : result;
+    return result == OK && *buffer == nullptr ? UNEXPECTED_NULL : result;
 }
 
 status_t Parcel::readEmbeddedBuffer(size_t size, size_t* handle, size_t parentHandle,
                                     size_t parentOffset, const void** buffer) const {
     status_t result = readObject(size, handle, true, parentHandle, parentOffset, buffer);
-    return result == OK && *buffer == nullptr ? BAD_VALUE : result;
+    return result == OK && *buffer == nullptr ? UNEXPECTED_NULL : result;
 }
 
 status_t Parcel::readNullableEmbeddedBuffer(size_t size, size_t* handle, size_t parentHandle,

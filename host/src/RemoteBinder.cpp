@@ -57,7 +57,7 @@ status_t RemoteBinder::transact(uint32_t code, const Parcel& data, Parcel* reply
 status_t RemoteBinder::linkToDeath(const sp<DeathRecipient>& recipient, void* /*cookie*/,
                                    uint32_t /*flags*/) {
     std::lock_guard<std::mutex> lock(mMutex);
-    if (mObituariesSent || mSession->isDead()) return DEAD_OBJECT;
+    if (mObituariesSent) return DEAD_OBJECT;
     mRecipients.emplace_back(recipient);
     if (mWatch == 0) {
         wp<RemoteBinder> self(this);

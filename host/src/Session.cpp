@@ -7,7 +7,6 @@
 
 #include <errno.h>
 #include <log/log.h>
-#include <poll.h>
 #include <sys/socket.h>
 
 #include <cstring>
@@ -103,13 +102,6 @@ void Session::markDead() {
     mDead = true;
     shutdown(first(), SHUT_RDWR);
     mChanged.notify_all();
-}
-
-bool Session::isDead() {
-    pollfd hangup = {first(), POLLRDHUP, 0};
-    if (poll(&hangup, 1, 0) > 0) markDead();
-    std::lock_guard<std::mutex> lock(mMutex);
-    return mDead;
 }
 
 } // namespace android::hardware::host

@@ -30,8 +30,6 @@ class Session {
 
     /** The server is gone: from now on, for ever, and for all the threads. */
     void markDead();
-    /** Asks the first connection, not the server. */
-    bool isDead();
 
     /** Hangs up when the session dies; open as long as the session exists. */
     int first() const { return mConnections.front().get(); }

@@ -7,6 +7,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <map>
 
 #include "host/src/BufferObject.h"
 #include "host/src/Frame.h"
@@ -129,6 +130,7 @@ bool keepsTheRules(const Bytes& frame) {
     uint64_t free = 0;
     uint64_t carried = 0;
     std::vector<uint64_t> rooms;
+    std::map<uint64_t, uint64_t> open;
     for (size_t i = 0; i < count; ++i) {
         const uint64_t offset = at<uint32_t>(frame, table + 4 * i);
         if (offset % 4 != 0 || offset < free) return false;
@@ -144,7 +146,15 @@ bool keepsTheRules(const Bytes& frame) {
         if (object.hasParent == 1) {
             if (object.parent >= rooms.size() || rooms[object.parent] < 8) return false;
             if (object.parentOffset > rooms[object.parent] - 8) return false;
+            // Only the last buffer and its ancestors are open, from the last place in them on.
+            if (open.count(object.parent) == 0) return false;
+            if (object.parentOffset < open[object.parent]) return false;
+            open.erase(open.upper_bound(object.parent), open.end());
+            open[object.parent] = object.parentOffset + 8;
+        } else {
+            open.clear();
         }
+        open[i] = 0;
         rooms.push_back(length);
         carried += padded(length);
     }

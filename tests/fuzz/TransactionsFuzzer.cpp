@@ -231,6 +231,15 @@ bool isDocumented(status_t status) {
            status == android::UNKNOWN_ERROR;
 }
 
+/** Whether the stub answered that a text was null. */
+bool isNullPointer(const Parcel& reply) {
+    int32_t exception = 0;
+    reply.setDataPosition(0);
+    const status_t read = reply.readInt32(&exception);
+    reply.setDataPosition(0);
+    return read == OK && exception == android::hardware::Status::EX_NULL_POINTER;
+}
+
 /** A well-formed call does what its suite does with the same arguments. */
 void checkPassedOn(const Call& call, const Reply& reply, RecordedShell& shell) {
     const std::vector<std::string> lines = shell.lines();
@@ -268,6 +277,9 @@ void makeCall(Input& input, const sp<BnHwWifiService>& stub, RecordedShell& shel
                                                result = readReply(call.method(), written);
                                            });
     check(isDocumented(status), "a status is one of IBinder's", std::to_string(status));
+    if (status == OK && isNullPointer(reply)) {
+        return check(!wellFormed && replies == 0, "only a null text is refused so", "another one");
+    }
     // The stub leaves a reply without a result to the transport, which has it when this returns.
     if (status == OK && call.method().result == 'v') {
         check(replies == 0, "a reply without a result is sent once", std::to_string(replies + 1));

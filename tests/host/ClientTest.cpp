@@ -168,8 +168,17 @@ TEST_F(ClientTest, UnlinkedIsNotNotified) {
 TEST_F(ClientTest, LinkAfterDeath) {
     sp<Recipient> recipient = new Recipient;
     killServer();
-    EXPECT_FALSE(service->linkToDeath(recipient, 7).withDefault(true));
+    EXPECT_TRUE(service->linkToDeath(recipient, 7).withDefault(false));
+    EXPECT_EQ(recipient->notice(), 7u);
     EXPECT_FALSE(service->unlinkToDeath(recipient).withDefault(true));
+}
+
+TEST_F(ClientTest, LinkAfterACallFoundTheDeath) {
+    sp<Recipient> recipient = new Recipient;
+    killServer();
+    EXPECT_EQ(call(service, "echo"), kDead);
+    EXPECT_TRUE(service->linkToDeath(recipient, 7).withDefault(false));
+    EXPECT_EQ(recipient->notice(), 7u);
 }
 
 TEST_F(ClientTest, LinkOfNull) {

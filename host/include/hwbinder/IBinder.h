@@ -39,7 +39,9 @@ class IBinder : public virtual RefBase {
     virtual status_t transact(uint32_t code, const Parcel& data, Parcel* reply, uint32_t flags = 0,
                               TransactCallback callback = nullptr) = 0;
 
-    /** Linked twice is notified twice. DEAD_OBJECT when it is too late, INVALID_OPERATION locally.
+    /**
+     * Linked twice is notified twice, and linked after the death at once. DEAD_OBJECT when notices
+     * have gone out already, INVALID_OPERATION locally.
      */
     virtual status_t linkToDeath(const sp<DeathRecipient>& recipient, void* cookie = nullptr,
                                  uint32_t flags = 0) = 0;

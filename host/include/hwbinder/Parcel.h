@@ -29,8 +29,8 @@ struct ReceivedBuffer;
  *     parcel.writeBuffer(&text, sizeof(text), &handle);
  *     parcel.writeEmbeddedBuffer(text.c_str(), text.size() + 1, &child, handle, 0);
  *
- * A read returns NOT_ENOUGH_DATA past the end of the data, and BAD_VALUE where the next thing is
- * not the buffer that the reader expects.
+ * A read returns NOT_ENOUGH_DATA past the end of the data, BAD_VALUE where the next thing is not
+ * the buffer that the reader expects, and UNEXPECTED_NULL where it is null.
  */
 class Parcel {
   public:
@@ -65,6 +65,7 @@ class Parcel {
     const char* readCString() const;
 
     status_t writeBuffer(const void* buffer, size_t length, size_t* handle);
+    /** BAD_VALUE unless the parent has room for the pointer there. */
     status_t writeEmbeddedBuffer(const void* buffer, size_t length, size_t* handle,
                                  size_t parentHandle, size_t parentOffset);
 
@@ -73,7 +74,7 @@ class Parcel {
     /** The next buffer, which must have this size and this parent. */
     status_t readEmbeddedBuffer(size_t size, size_t* handle, size_t parentHandle,
                                 size_t parentOffset, const void** buffer) const;
-    /** The same, and null is fine. */
+    /** The same, and null is fine for a size of 0. */
     status_t readNullableEmbeddedBuffer(size_t size, size_t* handle, size_t parentHandle,
                                         size_t parentOffset, const void** buffer) const;
 
