@@ -10,6 +10,7 @@ import os
 import shutil
 import stat
 import subprocess
+import tempfile
 
 from launcher import process, sandbox
 from launcher.description import SIMULATOR, Description, checked_path
@@ -36,18 +37,25 @@ def create(chip, folder, installs):
     folder = os.path.abspath(folder)
     if os.path.isdir(os.path.join(folder, "root", "phone")):
         raise PhoneError(f"{folder} is a phone already")
+    taken = PhoneError(f"{folder} exists and is not an empty folder")
     if os.path.lexists(folder) and not (os.path.isdir(folder) and not os.listdir(folder)):
-        raise PhoneError(f"{folder} exists and is not an empty folder")
+        raise taken
     description = Description(chip)
     pairs = [_source_and_destination(text) for text in installs]
-    unfinished = f"{os.path.dirname(folder)}/.{os.path.basename(folder)}.{os.getpid()}"
+    outer, name = os.path.split(folder)
+    os.makedirs(outer, exist_ok=True)
+    unfinished = tempfile.mkdtemp(prefix=f".{name}.", dir=outer)
     try:
-        os.makedirs(f"{unfinished}/root")
+        os.chmod(unfinished, 0o755)
+        os.mkdir(f"{unfinished}/root")
         Builder(f"{unfinished}/root").build(description, pairs)
         kind = process.choose(unfinished)
         with open(f"{unfinished}/sandbox", "w", encoding="ascii") as record:
             record.write(kind + "\n")
-        os.rename(unfinished, folder)
+        try:
+            os.rename(unfinished, folder)
+        except OSError:  # another create was faster
+            raise taken from None
     except BaseException:
         shutil.rmtree(unfinished, ignore_errors=True)
         raise

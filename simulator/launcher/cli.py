@@ -41,12 +41,15 @@ def main(arguments):
         "run": run,
         "fault": fault,
     }
+    open_closed_streams()
     if arguments in (["--help"], ["-h"], ["help"]):
         print(USAGE, end="")
         return 0
     os.umask(0o022)
     signal.signal(signal.SIGCHLD, signal.SIG_DFL)  # ignored, it would take away the exit codes
-    signal.signal(signal.SIGTERM, signal.default_int_handler)  # a command ended by it cleans up
+    for number in (signal.SIGTERM, signal.SIGHUP):  # a command ended by them cleans up
+        if signal.getsignal(number) != signal.SIG_IGN:
+            signal.signal(number, signal.default_int_handler)
     name = arguments[0] if arguments else ""
     try:
         if name not in commands:
@@ -56,12 +59,21 @@ def main(arguments):
         print(USAGE, end="", file=sys.stderr)
         return 2
     except (PhoneError, OSError) as error:
-        if isinstance(error, OSError) and error.filename:
-            error = f"{error.filename}: {error.strerror}"
+        if isinstance(error, OSError):
+            error = f"{error.filename}: {error.strerror}" if error.filename else error.strerror
         print(f"phone: {error}", file=sys.stderr)
         return 125 if name == "run" else 1
     except KeyboardInterrupt:
         return 130
+
+
+def open_closed_streams():
+    """A closed standard stream becomes /dev/null: no file that is opened later takes its number."""
+    while (stream := os.open(os.devnull, os.O_RDWR)) < 3:
+        os.set_inheritable(stream, True)
+    os.close(stream)
+    if sys.stderr is None:
+        sys.stderr = open(2, "w", encoding="utf-8")
 
 
 def phone_folder(arguments):
@@ -102,7 +114,7 @@ def create(arguments):
 def up(arguments):
     from launcher import power
 
-    power.up(phone_folder(arguments), boot=True)
+    power.up(phone_folder(arguments))
     return 0
 
 

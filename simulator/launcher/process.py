@@ -34,16 +34,16 @@ def run(kind, folder, command, streams=()):
     the standard streams, standard input first."""
     sandbox = Sandbox(kind, folder, command, streams)
     launcher = os.getpid()
-    _block_signals()
+    block_signals()
     holder = os.fork()
     if holder == 0:
         _hold(launcher, sandbox)
     for number in Sandbox.HANDLERS:
         if signal.getsignal(number) != signal.SIG_IGN:  # what the caller ignores stays ignored
             signal.signal(number, lambda number, _frame: _pass_on(holder, number))
-    _unblock_signals()
+    unblock_signals()
     os.waitid(os.P_PID, holder, os.WEXITED | os.WNOWAIT)
-    _block_signals()  # nothing is passed on once the next line has freed the holder's number
+    block_signals()  # nothing is passed on once the next line has freed the holder's number
     return _code(os.waitpid(holder, 0)[1])
 
 
@@ -92,7 +92,7 @@ class Sandbox:
     def hold(self, stop=None):
         """Runs the command and returns its exit code, 128 + n for signal n, once no process is
         left. What can be read from the descriptor `stop` ends it."""
-        _block_signals()
+        block_signals()
         os.setsid()
         _prctl(PR_SET_CHILD_SUBREAPER, 1)
         signal.signal(signal.SIGALRM, lambda _number, _frame: os.kill(self.pid, signal.SIGKILL))
@@ -101,9 +101,9 @@ class Sandbox:
         self.pid = os.fork()
         if self.pid == 0:
             _become(self.line, self.streams)
-        _unblock_signals()
+        unblock_signals()
         self._wait(stop)
-        _block_signals()  # the next line frees the number
+        block_signals()  # the next line frees the number
         status = os.waitpid(self.pid, 0)[1]
         _end_orphans()
         if os.WIFSIGNALED(status) and self.kind == "proot":
@@ -167,7 +167,7 @@ def _become(line, streams):
         os.setsid()
         for number in signal.valid_signals() - {signal.SIGKILL, signal.SIGSTOP}:
             signal.signal(number, signal.SIG_DFL)
-        _unblock_signals()
+        unblock_signals()
         for number, stream in enumerate(streams):
             os.dup2(stream, number)
         os.closerange(3, os.sysconf("SC_OPEN_MAX"))
@@ -178,11 +178,11 @@ def _become(line, streams):
         os._exit(125)
 
 
-def _block_signals():
+def block_signals():
     signal.pthread_sigmask(signal.SIG_BLOCK, signal.valid_signals())
 
 
-def _unblock_signals():
+def unblock_signals():
     signal.pthread_sigmask(signal.SIG_SETMASK, ())
 
 
