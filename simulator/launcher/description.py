@@ -60,14 +60,17 @@ class Description:
     def _lines(self, chip):
         try:
             with open(self.path, encoding="utf-8") as description:
-                return description.read().splitlines()
+                text = description.read()
         except UnicodeDecodeError:
-            raise PhoneError(f"{self.path}: not a text file") from None
+            text = "\0"
         except OSError as error:
             if "/" in chip:
                 raise PhoneError(f"{self.path}: {error.strerror}") from None
             known = ", ".join(sorted(os.listdir(os.path.join(SIMULATOR, "phones"))))
             raise PhoneError(f"no phone '{chip}'; known: {known}") from None
+        if "\0" in text:
+            raise PhoneError(f"{self.path}: not a text file")
+        return text.splitlines()
 
     def _property(self, text):
         name, value = _split(text, 2)

@@ -3,8 +3,8 @@
 """Reaches the files inside a phone from outside.
 
 What runs inside may put a link in the place of any of them, and a link that is followed outside
-leads to the machine's files. So every folder on the way is opened by itself, none through a link, and
-files are named relative to the folder that is open.
+leads to the machine's files. So every folder on the way is opened by itself, none through a link,
+and files are named relative to the folder that is open.
 """
 
 import os

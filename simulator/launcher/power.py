@@ -64,7 +64,7 @@ def restart_service(folder):
 
 
 def _queue(folder):
-    """Waits until no other command switches the phone. The next one waits until this process ends."""
+    """Waits until no other command switches the phone. The next one waits for this one's end."""
     if not _until(QUEUE_SECONDS, lambda turn=os.open(folder, os.O_RDONLY): _locks(turn)):
         raise PhoneError(f"{folder} has been locked for {QUEUE_SECONDS} s")
 
@@ -93,7 +93,7 @@ def _until(seconds, condition):
 
 
 def _start(folder, lock, boot):
-    """Starts the keeper, which inherits the lock. `boot` is False for another start of the service."""
+    """Starts the keeper, which inherits the lock. Without `boot` the state stays as it is."""
     kind = chosen_kind(folder)
     place, path = socket_folder(kind, folder)
     sockets = Folder(place, f"{path}/hidl", make=True)

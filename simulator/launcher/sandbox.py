@@ -49,8 +49,11 @@ def chosen_kind(folder):
         if asked not in KINDS:
             raise PhoneError(f"BEX_PHONE_SANDBOX is '{asked}', not bwrap or proot")
         return asked
-    with open(os.path.join(folder, "sandbox"), encoding="ascii") as record:
-        return record.read().strip()
+    with open(os.path.join(folder, "sandbox"), encoding="ascii", errors="replace") as record:
+        kind = record.read().strip()
+    if kind not in KINDS:
+        raise PhoneError(f"{folder}/sandbox names '{kind}', not bwrap or proot")
+    return kind
 
 
 def command_line(kind, folder):

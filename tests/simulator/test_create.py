@@ -93,6 +93,8 @@ def test_a_bad_install_leaves_nothing(launcher, place, install, complaint):
     (GOOD + "file etc/x text\n", "3: 'etc/x' is not an absolute path"),
     (GOOD + "capture a b c\n", "3: bad name 'b c'"),
     ("\0\xff", "not a text file"),
+    (GOOD + "property a x\0y\n", "not a text file"),
+    (GOOD + "file /data/x\0y text\n", "not a text file"),
 ])
 def test_a_bad_description_is_one_clear_line(launcher, place, text, complaint):
     description = place / "description"

@@ -110,8 +110,8 @@ def test_clear_lets_waiting_tools_go_on(phone):
 
 
 @pytest.mark.parametrize("actions", [
-    ("explode",), ("exit",), ("exit", "256"), ("exit", "x"), ("exit", "-1"), ("exit", "1" * 5000), ("signal", "0"),
-    ("signal", "65"), ("sleep", "-1"), ("sleep", "long"), ("print", "/nonesuch"), ("print", "/tmp"),
+    ("explode",), ("exit",), ("exit", "256"), ("exit", "x"), ("exit", "-1"), ("exit", "1" * 5000),
+    ("signal", "0"), ("signal", "65"), ("sleep", "-1"), ("sleep", "long"), ("print", "/nonesuch"), ("print", "/tmp"),
     ("clear", "now"), ("missing", "exit", "3")])
 def test_a_bad_action_changes_nothing(phone, actions):
     phone.fault("wl", "exit", 3)

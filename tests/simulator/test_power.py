@@ -161,6 +161,16 @@ def test_an_unknown_sandbox_is_refused(phone):
         == (125, "phone: BEX_PHONE_SANDBOX is 'jail', not bwrap or proot\n")
 
 
+@pytest.mark.parametrize("words", [b"jail\n", b"", b"\xff"])
+def test_a_spoilt_record_of_the_sandbox_is_one_clear_line(phone, words):
+    (phone.folder / "sandbox").unlink()  # the pattern's, too
+    (phone.folder / "sandbox").write_bytes(words)
+    launcher = Launcher(phone.launcher.line[-1], "", phone.launcher.user)
+    result = launcher("run", phone.folder, "true")
+    assert result.returncode == 125
+    assert result.stderr.startswith(f"phone: {phone.folder}/sandbox names '")
+
+
 def test_the_phone_of_another_user_is_refused(any_new_phone, program):
     if any_new_phone.launcher.user == "self":
         return  # only root can be two users

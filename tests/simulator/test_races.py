@@ -64,8 +64,8 @@ def test_up_waits_for_a_program_that_looks_at_the_lock(looked_at):
 
 def test_down_kills_nobody_by_a_stale_number(looked_at):
     phone, lock = looked_at
-    with subprocess.Popen(["setpriv", f"--reuid={phone.root.stat().st_uid}", "--clear-groups",
-                           "sleep", "1000"] if os.geteuid() == 0 else ["sleep", "1000"]) as stranger:
+    user = phone.root.stat().st_uid
+    with subprocess.Popen(["sleep", "1000"], user=user if os.geteuid() == 0 else None) as stranger:
         try:
             lock.write(f"{stranger.pid}\n".encode())
             lock.flush()
@@ -95,14 +95,20 @@ def test_two_restarts_at_once(off):
     assert off.processes() == []
 
 
-def test_down_ends_an_up_that_waits_for_its_service(any_launcher, place):
+def start_up_that_waits(launcher, place):
+    """A phone, and an `up` that waits for its service to register."""
     service = place / "service"
     service.write_text("#!/system/bin/sh\nread x </phone/endless\n")
     service.chmod(0o755)
-    phone = Phone.create(any_launcher, place / "phone", "--install", f"{service}={SERVICE}")
+    phone = Phone.create(launcher, place / "phone", "--install", f"{service}={SERVICE}")
     phone.output("mkfifo /phone/endless")
     waiting = start(phone, "up")
     wait_until(lambda: (phone.folder / "pid").exists() and (phone.folder / "pid").read_text())
+    return phone, waiting
+
+
+def test_down_ends_an_up_that_waits_for_its_service(any_launcher, place):
+    phone, waiting = start_up_that_waits(any_launcher, place)
     phone.do("down")
     code, text = finish(waiting)
     assert code == 1 and "before it registered" in text
@@ -111,13 +117,7 @@ def test_down_ends_an_up_that_waits_for_its_service(any_launcher, place):
 
 @pytest.mark.parametrize("number", [signal.SIGINT, signal.SIGTERM, signal.SIGHUP])
 def test_an_up_that_is_ended_takes_the_phone_down(launcher, place, number):
-    service = place / "service"
-    service.write_text("#!/system/bin/sh\nread x </phone/endless\n")
-    service.chmod(0o755)
-    phone = Phone.create(launcher, place / "phone", "--install", f"{service}={SERVICE}")
-    phone.output("mkfifo /phone/endless")
-    waiting = start(phone, "up")
-    wait_until(lambda: (phone.folder / "pid").exists() and (phone.folder / "pid").read_text())
+    phone, waiting = start_up_that_waits(launcher, place)
     waiting.send_signal(number)
     assert finish(waiting) == (130, "")
     assert phone.processes() == []

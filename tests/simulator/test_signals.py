@@ -24,9 +24,10 @@ def script(phone, text, *command):
     """Runs a shell script on this machine, as the phone's user, in a session of its own. Its
     arguments are the command that runs something in the phone."""
     launcher = phone.launcher
-    return subprocess.run([*launcher.line[:-1], "bash", "-c", text, "bash", launcher.line[-1], "run",
-                           phone.folder, *command], capture_output=True, text=True, check=False,
-                          env=launcher.environment, timeout=60, start_new_session=True)
+    *user, program = launcher.line
+    return subprocess.run([*user, "bash", "-c", text, "bash", program, "run", phone.folder, *command],
+                          capture_output=True, text=True, check=False, env=launcher.environment,
+                          timeout=60, start_new_session=True)
 
 
 @pytest.mark.parametrize("line", ["kill -9 0", "busybox setsid sh -c 'kill -9 0'; kill -9 0"])
@@ -65,8 +66,8 @@ def test_what_the_caller_ignores_is_not_ignored_inside(any_new_phone, name):
 
 @contextlib.contextmanager
 def at_terminal(phone, line):
-    """A phone run whose standard streams are a terminal that it has for itself: the launcher and the
-    terminal's other end."""
+    """A phone run whose standard streams are a terminal of its own: the launcher, and the other end
+    of the terminal."""
     outer, inner = pty.openpty()
     attributes = termios.tcgetattr(inner)
     attributes[3] &= ~termios.ECHO
