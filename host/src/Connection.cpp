@@ -43,6 +43,10 @@ void Listener::onReady(uint32_t /*events*/) {
             closeConnection(std::move(client));
         } else if (Engine::get().isFull()) {
             ALOGW("Too many clients, one was turned away");
+            FrameHeader refusal;
+            refusal.flags = FrameHeader::kReply;
+            refusal.status = WOULD_BLOCK;
+            sendFrame(client.get(), refusal, nullptr, MSG_DONTWAIT);
             closeConnection(std::move(client));
         } else {
             Engine::get().add(std::make_shared<Connection>(std::move(client), mTarget));

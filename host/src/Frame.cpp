@@ -89,10 +89,17 @@ void ParcelAccess::serialise(const Parcel& parcel, const FrameHeader& header, ui
     const auto& offsets = parcel.mObjects;
     uint8_t* out = put(payload, data, header.dataSize);
     out = put(out, offsets.data(), offsets.size() * sizeof(offsets[0]));
+    std::vector<uint8_t*> buffers;
+    buffers.reserve(offsets.size());
     for (uint32_t offset : offsets) {
         BufferObject object = objectAt(data, offset);
         const auto* bytes = reinterpret_cast<const uint8_t*>(object.buffer);
+        buffers.push_back(out);
         out = put(out, bytes, carriedLength(object));
+        // This process's addresses are nobody else's business.
+        if (object.hasParent != 0) {
+            memset(buffers[object.parent] + object.parentOffset, 0, sizeof(object.buffer));
+        }
         object.buffer = bytes == nullptr ? 0 : 1;
         memcpy(payload + offset, &object, sizeof(object));
     }

@@ -4,6 +4,7 @@
 #include "host/src/RemoteBinder.h"
 
 #include <hwbinder/Parcel.h>
+#include <sys/socket.h>
 
 #include <algorithm>
 #include <utility>
@@ -14,17 +15,24 @@
 namespace android::hardware::host {
 namespace {
 
-/** One answer, and whether more can be expected of the connection. */
-status_t awaitReply(int connection, Parcel* reply) {
+/** The answer that has come, or, without MSG_DONTWAIT, that comes. */
+status_t receiveReply(int connection, int flags, Parcel* reply) {
+    FrameReader reader(connection);
     FrameHeader header;
-    switch (FrameReader(connection).receive(0, &header, reply)) {
-        case Receipt::kFrame:
-            return header.status;
-        case Receipt::kNoRoom:
-            return FAILED_TRANSACTION;
-        default:
-            return DEAD_OBJECT;
-    }
+    Receipt receipt = reader.receive(flags, &header, reply);
+    // The socket tells first that the server has hung up, then what it had said.
+    if (receipt == Receipt::kClosed) receipt = reader.receive(MSG_DONTWAIT, &header, reply);
+    if (receipt == Receipt::kNoRoom) return FAILED_TRANSACTION;
+    const bool answered = receipt == Receipt::kFrame && (header.flags & FrameHeader::kReply) != 0;
+    return answered ? header.status : status_t{DEAD_OBJECT};
+}
+
+status_t call(int connection, const FrameHeader& header, const Parcel& data, Parcel* reply) {
+    const status_t sent = sendFrame(connection, header, &data, 0);
+    // A server that does not take it may have said why.
+    if (sent == DEAD_OBJECT) return receiveReply(connection, MSG_DONTWAIT, reply);
+    if (sent != OK || (header.flags & FrameHeader::kOneway) != 0) return sent;
+    return receiveReply(connection, 0, reply);
 }
 
 } // namespace
@@ -38,17 +46,21 @@ RemoteBinder::~RemoteBinder() {
 status_t RemoteBinder::transact(uint32_t code, const Parcel& data, Parcel* reply, uint32_t flags,
                                 TransactCallback callback) {
     const bool oneway = (flags & FLAG_ONEWAY) != 0;
-    const int connection = mSession->acquire();
-    if (connection < 0) return DEAD_OBJECT;
-
     FrameHeader header;
     header.flags = oneway ? uint32_t{FrameHeader::kOneway} : 0;
     header.code = code;
     Parcel ignored;
     if (reply == nullptr) reply = &ignored;
-    status_t result = sendFrame(connection, header, &data, 0);
-    if (result == OK && !oneway) result = awaitReply(connection, reply);
-    if (result == DEAD_OBJECT) mSession->markDead();
+    int connection = -1;
+    status_t result = WOULD_BLOCK;
+    while (result == WOULD_BLOCK) {
+        result = mSession->acquire(&connection);
+        if (result != OK) return result;
+        result = call(connection, header, data, reply);
+        // Nothing ran. Another connection may serve it.
+        if (result == WOULD_BLOCK) mSession->drop(connection);
+    }
+    if (result == DEAD_OBJECT) mSession->end(DEAD_OBJECT);
     mSession->release(connection);
     if (result == OK && !oneway && callback) callback(*reply);
     return result;
@@ -81,7 +93,7 @@ status_t RemoteBinder::unlinkToDeath(const wp<DeathRecipient>& recipient, void* 
 }
 
 void RemoteBinder::sendObituaries() {
-    mSession->markDead();
+    mSession->end(DEAD_OBJECT);
     std::vector<wp<DeathRecipient>> recipients;
     {
         std::lock_guard<std::mutex> lock(mMutex);

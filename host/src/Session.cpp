@@ -9,6 +9,7 @@
 #include <log/log.h>
 #include <sys/socket.h>
 
+#include <algorithm>
 #include <cstring>
 #include <utility>
 
@@ -62,14 +63,14 @@ Session::Session(const std::string& path, const FileIdentity& identity, base::un
     mConnections.push_back(std::move(first));
 }
 
-int Session::acquire() {
+status_t Session::acquire(int* connection) {
     std::unique_lock<std::mutex> lock(mMutex);
     for (;;) {
-        if (mDead) return -1;
+        if (mStatus != OK) return mStatus;
         if (!mIdle.empty()) {
-            const int connection = mIdle.back();
+            *connection = mIdle.back();
             mIdle.pop_back();
-            return connection;
+            return OK;
         }
         if (!mMayGrow || mConnecting || mConnections.size() == kMaxConnections) {
             mChanged.wait(lock);
@@ -83,11 +84,11 @@ int Session::acquire() {
         mConnecting = false;
         mChanged.notify_all();
         // Another incarnation has the name now, so this one can no longer be reached anew.
-        mMayGrow = added.ok() && identity == mIdentity;
+        mMayGrow = mMayGrow && added.ok() && identity == mIdentity;
         if (!mMayGrow) continue;
-        const int connection = added.get();
+        *connection = added.get();
         mConnections.push_back(std::move(added));
-        return connection;
+        return OK;
     }
 }
 
@@ -97,9 +98,16 @@ void Session::release(int connection) {
     mChanged.notify_one();
 }
 
-void Session::markDead() {
+void Session::drop(int connection) {
+    if (connection == first()) return end(WOULD_BLOCK);
     std::lock_guard<std::mutex> lock(mMutex);
-    mDead = true;
+    mMayGrow = false;
+    mConnections.erase(std::find(mConnections.begin(), mConnections.end(), connection));
+}
+
+void Session::end(status_t status) {
+    std::lock_guard<std::mutex> lock(mMutex);
+    if (mStatus == OK) mStatus = status;
     shutdown(first(), SHUT_RDWR);
     mChanged.notify_all();
 }

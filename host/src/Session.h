@@ -24,12 +24,21 @@ class Session {
     /** Null when nobody answers at the path. */
     static std::unique_ptr<Session> open(const std::string& path);
 
-    /** A connection for one call; waits for one when there can be no more. Dead: -1. */
-    int acquire();
+    /**
+     * A connection for one call; waits for one when there can be no more. Else the status with
+     * which the session ended.
+     */
+    status_t acquire(int* connection);
     void release(int connection);
+    /** In place of release(): the server has too many clients and has taken no call from it. */
+    void drop(int connection);
 
-    /** The server is gone: from now on, for ever, and for all the threads. */
-    void markDead();
+    /**
+     * No more calls, for ever and for all the threads.
+     *
+     * @param status DEAD_OBJECT when the server is gone, WOULD_BLOCK when it never let this in.
+     */
+    void end(status_t status);
 
     /** Hangs up when the session dies; open as long as the session exists. */
     int first() const { return mConnections.front().get(); }
@@ -46,7 +55,7 @@ class Session {
     std::vector<int> mIdle;
     bool mConnecting = false;
     bool mMayGrow = true;
-    bool mDead = false;
+    status_t mStatus = OK;
 };
 
 } // namespace android::hardware::host

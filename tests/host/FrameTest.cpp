@@ -5,13 +5,18 @@
 
 #include <hidl/HidlBinderSupport.h>
 #include <sys/mman.h>
+#include <sys/socket.h>
 #include <unistd.h>
 
 #include <cstring>
+#include <filesystem>
 #include <random>
 
 #include "host/src/Frame.h"
 #include "host/src/ReceivedBuffer.h"
+#include "host/src/RemoteBinder.h"
+#include "host/src/Session.h"
+#include "host/src/SocketFile.h"
 #include "tests/host/PeerTest.h"
 
 namespace vendor::korvan::bex::wifi::tests {
@@ -97,6 +102,50 @@ TEST_F(FrameTest, PeersThatOnlyAnnounce) {
         sendBytes(peer.get(), Bytes(1), {file.get()});
         EXPECT_EQ(answerTo(peer.get()).status, OK);
     }
+}
+
+// The header's sizes tell where the buffers begin: the text's struct is the first of them.
+uint64_t addressOfText(const Bytes& frame) {
+    FrameHeader header;
+    memcpy(&header, frame.data(), sizeof(header));
+    uint64_t address;
+    memcpy(&address, frame.data() + frame.size() - header.bufferSize, sizeof(address));
+    return address;
+}
+
+TEST_F(FrameTest, AddressesDoNotCrossTheWire) {
+    const Bytes request = validFrame("text");
+    EXPECT_EQ(addressOfText(request), 0u);
+
+    unique_fd peer = connectToServer();
+    sendBytes(peer.get(), request);
+    Bytes reply(4'096);
+    const ssize_t got = recv(peer.get(), reply.data(), reply.size(), 0);
+    ASSERT_GT(got, static_cast<ssize_t>(sizeof(FrameHeader)));
+    reply.resize(static_cast<size_t>(got));
+    EXPECT_EQ(addressOfText(reply), 0u);
+}
+
+// A listening socket in the service's place.
+TEST_F(HostTest, OnlyAReplyIsTakenForAnAnswer) {
+    const std::string path = host::socketPath(IWifiService::descriptor, "default");
+    std::filesystem::create_directories(socketFolder());
+    sockaddr_un address;
+    ASSERT_EQ(host::socketAddress(path, &address), OK);
+    unique_fd listener(socket(AF_UNIX, SOCK_SEQPACKET | SOCK_CLOEXEC, 0));
+    ASSERT_EQ(bind(listener.get(), reinterpret_cast<sockaddr*>(&address), sizeof(address)), 0);
+    ASSERT_EQ(listen(listener.get(), 1), 0);
+
+    sp<IBinder> binder = new host::RemoteBinder(host::Session::open(path));
+    unique_fd server(accept4(listener.get(), nullptr, nullptr, SOCK_CLOEXEC));
+    Bytes frame = validFrame("text");
+    ASSERT_EQ(send(server.get(), frame.data(), frame.size(), 0),
+              static_cast<ssize_t>(frame.size()));
+    Parcel call;
+    const hidl_string text = "text";
+    fillCall(&call, text);
+    Parcel reply;
+    EXPECT_EQ(binder->transact(16, call, &reply), ::android::DEAD_OBJECT);
 }
 
 // Whatever a frame says, reading it touches nothing but its own memory (run under ASan to see).

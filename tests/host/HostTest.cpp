@@ -136,7 +136,11 @@ void HostTest::write(const std::string& path, const std::string& text) const {
 
 void ServedTest::SetUp() {
     HostTest::SetUp();
-    server = std::make_unique<ServerProcess>(kUsualServer);
+    serve(kUsualServer);
+}
+
+void ServedTest::serve(const std::vector<std::string>& steps) {
+    server = std::make_unique<ServerProcess>(steps);
     ASSERT_EQ(server->report(), "0");
     ASSERT_EQ(server->report(), "ready");
     service = IWifiService::tryGetService();

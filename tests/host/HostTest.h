@@ -80,6 +80,8 @@ class HostTest : public ::testing::Test {
 class ServedTest : public HostTest {
   protected:
     void SetUp() override;
+    /** Starts a server, in place of the one before if there is one, and finds it. */
+    void serve(const std::vector<std::string>& steps);
 
     std::unique_ptr<ServerProcess> server;
     sp<IWifiService> service;

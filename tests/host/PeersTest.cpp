@@ -9,14 +9,24 @@
 
 #include <future>
 
+#include "host/src/RemoteBinder.h"
+#include "host/src/Session.h"
+#include "host/src/SocketFile.h"
 #include "tests/host/PeerTest.h"
 
 namespace vendor::korvan::bex::wifi::tests {
 namespace {
 
 using ::android::OK;
+using ::android::WOULD_BLOCK;
 using ::android::base::unique_fd;
+using ::android::hardware::hidl_string;
+using ::android::hardware::IBinder;
+using ::android::hardware::Parcel;
 using ::android::hardware::host::FrameHeader;
+using ::android::hardware::host::RemoteBinder;
+using ::android::hardware::host::Session;
+using ::android::hardware::host::socketPath;
 
 class PeersTest : public PeerTest {};
 
@@ -114,24 +124,53 @@ TEST_F(PeersTest, CallsOfPeersThatHaveLeftAreDropped) {
     EXPECT_EQ(call(service, "count"), "3");
 }
 
-// Too many at once: the server keeps descriptors for its own work and goes on.
-TEST_F(PeersTest, FloodOfConnections) {
-    std::vector<std::string> steps = {"descriptors", "64"};
-    steps.insert(steps.end(), kUsualServer.begin(), kUsualServer.end());
-    server = std::make_unique<ServerProcess>(steps);
-    ASSERT_EQ(server->report(), "0");
-    ASSERT_EQ(server->report(), "ready");
-    service = IWifiService::tryGetService();
-    EXPECT_EQ(call(service, "first"), "first");
-    {
-        std::vector<unique_fd> peers;
+// Too many at once: the server keeps descriptors for its own work, says so and goes on.
+class FullServerTest : public PeerTest {
+  protected:
+    void SetUp() override {
+        PeerTest::SetUp();
+        std::vector<std::string> steps = {"descriptors", "64"};
+        steps.insert(steps.end(), kUsualServer.begin(), kUsualServer.end());
+        serve(steps);
+        EXPECT_EQ(call(service, "first"), "first");
         for (int i = 0; i < 200; ++i) peers.push_back(connectToServer());
+        EXPECT_EQ(answerTo(peers.back().get()).status, WOULD_BLOCK);
         EXPECT_TRUE(isTurnedAway(peers.back().get()));
-        EXPECT_EQ(call(service, "alive"), "alive");
-        EXPECT_LT(descriptorsOfServer(), 48u);
     }
+
+    std::vector<unique_fd> peers;
+};
+
+TEST_F(FullServerTest, GoesOn) {
+    EXPECT_EQ(call(service, "alive"), "alive");
+    EXPECT_LT(descriptorsOfServer(), 48u);
+    peers.clear();
     EXPECT_TRUE(comesDownTo(16));
     EXPECT_EQ(call(IWifiService::tryGetService(), "anew"), "anew");
+}
+
+TEST_F(FullServerTest, TellsARefusedClient) {
+    const std::string path = socketPath(IWifiService::descriptor, "default");
+    for (const size_t size : {10, 100'000}) {
+        sp<IBinder> binder = new RemoteBinder(Session::open(path));
+        Parcel call;
+        const hidl_string text = std::string(size, 'x');
+        fillCall(&call, text);
+        for (int i = 0; i < 3; ++i) {
+            Parcel reply;
+            EXPECT_EQ(binder->transact(16, call, &reply), WOULD_BLOCK) << size;
+        }
+    }
+}
+
+// Those that the proxy's other connection serves: nobody is told that the service is dead.
+TEST_F(FullServerTest, ServesAClientThatWantsMoreConnections) {
+    auto held = std::async(std::launch::async, [&] { return call(service, "wait"); });
+    ASSERT_EQ(server->report(), "entered");
+    auto other = std::async(std::launch::async, [&] { return call(service, "other"); });
+    server->openGate();
+    EXPECT_EQ(held.get(), "done");
+    EXPECT_EQ(other.get(), "other");
 }
 
 } // namespace
