@@ -71,7 +71,7 @@ TEST_F(ReceptionTest, FindsTheGoodPackets) {
 
 // clang-format on
 
-TEST_F(ReceptionTest, SplitsNoFieldsBehindTheCount) {
+TEST_F(ReceptionTest, SplitsNoFieldsAfterTheCount) {
     class SplittingSuit : public BrcmTestSuit {
       public:
         std::vector<std::string> splitString(const std::string& str,
