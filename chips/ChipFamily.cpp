@@ -3,6 +3,8 @@
 
 #include "chips/ChipFamily.h"
 
+#include "chips/ModuleFiles.h"
+
 namespace vendor::korvan::bex::wifi {
 
 namespace {
@@ -10,7 +12,7 @@ namespace {
 // clang-format off
 constexpr DriverFile kConMode      = {"/sys/module/wlan/parameters/con_mode",        "wlan",   true};
 constexpr DriverFile kFirmwarePath = {"/sys/module/bcmdhd/parameters/firmware_path", "bcmdhd", false};
-constexpr DriverFile kMfgFirmware  = {"/etc/firmware/fw_bcmdhd_mfg.bin",             "",       false};
+constexpr DriverFile kMfgFirmware  = {kMfgFirmwarePath,                              "",       false};
 constexpr DriverFile kFirmware     = {"/etc/firmware/fw_bcmdhd.bin",                 "",       false};
 // clang-format on
 

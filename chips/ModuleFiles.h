@@ -5,7 +5,10 @@
 
 namespace vendor::korvan::bex::wifi {
 
-// Where a phone keeps the kernel modules of its WLAN driver.
+// Where a phone keeps the files of its WLAN driver.
+
+/** The image that the Broadcom driver loads for tests. */
+inline constexpr const char* kMfgFirmwarePath = "/etc/firmware/fw_bcmdhd_mfg.bin";
 
 /** The places of a driver that is one file, in the order of the search. */
 inline constexpr const char* kModuleCandidates[] = {

@@ -7,14 +7,12 @@
 #include <dirent.h>
 #include <unistd.h>
 
-#include "chips/ModuleFiles.h"
-
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
-int findFwPath(const char* tag, std::string* fwPath) {
-    for (const char* candidate : kModuleCandidates) {
-        if (access(candidate, R_OK) == 0) {
-            *fwPath = candidate;
+int findFwPath(const char* tag, FirmwarePathStrings& strings) {
+    for (const std::string& candidate : strings.FwPathCandidates) {
+        if (access(candidate.c_str(), R_OK) == 0) {
+            strings.FwPath = candidate;
             return 0;
         }
     }
@@ -22,17 +20,18 @@ int findFwPath(const char* tag, std::string* fwPath) {
     return -1;
 }
 
-int listDriverPaths(const char* tag, std::vector<std::string>* driverPaths) {
-    DIR* directory = opendir(kModuleFolder);
+int listDriverPaths(const char* tag, const DriverPathStrings& strings,
+                    std::vector<std::string>& driverPaths) {
+    DIR* directory = opendir(strings.driverDir.c_str());
     if (directory == nullptr) return -1;
     while (const dirent* entry = readdir(directory)) {
         const std::string name = entry->d_name;
-        if (name.rfind(kModulePrefix, 0) != 0) continue;
+        if (name.rfind(strings.driverPrefix, 0) != 0) continue;
         __android_log_print(ANDROID_LOG_ERROR, tag, "getDriverPaths: %s", name.c_str());
-        driverPaths->push_back(std::string(kModuleFolder) + "/" + name);
+        driverPaths.push_back(strings.driverDir + "/" + name);
     }
     closedir(directory);
-    return driverPaths->empty() ? -1 : 0;
+    return driverPaths.empty() ? -1 : 0;
 }
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

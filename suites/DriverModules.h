@@ -3,31 +3,55 @@
 
 #pragma once
 
+#include <iterator>
 #include <string>
 #include <vector>
 
+#include "chips/ModuleFiles.h"
+
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
-// The search for the kernel module files of the WLAN driver (chips/ModuleFiles.h).
+// How a suite finds the kernel module files of its WLAN driver, and the strings for that, which
+// each suite's unit has for itself.
+
+/** The strings of a suite whose driver is one module file. */
+struct FirmwarePathStrings {
+    /** No operation reads it. */
+    std::string MfgFirmwarePath = kMfgFirmwarePath;
+    /** The places of the module file, in the order of the search. */
+    std::string FwPathCandidates[std::size(kModuleCandidates)] = {
+            kModuleCandidates[0], kModuleCandidates[1], kModuleCandidates[2],
+            kModuleCandidates[3], kModuleCandidates[4],
+    };
+    /** The module file, once one has been found. All objects of the suite's class share it. */
+    std::string FwPath;
+};
 
 /**
- * Looks for the one module file of the driver in kModuleCandidates, and takes the first that can
- * be read.
+ * Sets FwPath to the first of the candidates that can be read. Without one it stays as it is, and
+ * an error is logged.
  *
  * @param tag The log tag of the caller.
- * @param fwPath Set to the file's path; stays as it is when there is none.
- * @return 0, or -1, with an error line, when there is none.
+ * @return 0, or -1 when there is none.
  */
-int findFwPath(const char* tag, std::string* fwPath);
+int findFwPath(const char* tag, FirmwarePathStrings& strings);
+
+/** The strings of a suite whose driver is several module files. */
+struct DriverPathStrings {
+    /** The folder of the files, and how their names begin. */
+    std::string driverDir = kModuleFolder;
+    std::string driverPrefix = kModulePrefix;
+};
 
 /**
- * Adds every file in kModuleFolder whose name begins with kModulePrefix, with an error line for
- * each, in the order in which the directory lists them.
+ * Adds the path of every file in the folder whose name begins with the prefix, in the order in
+ * which the folder lists them, and logs each name as an error.
  *
  * @param tag The log tag of the caller.
- * @param driverPaths Gets the paths, behind those that it has.
- * @return 0 when it holds a path then; -1 when not, or when the directory cannot be opened.
+ * @param driverPaths Gets the paths, after those that it has.
+ * @return 0 when it then holds a path; -1 when not, or when the folder cannot be opened.
  */
-int listDriverPaths(const char* tag, std::vector<std::string>* driverPaths);
+int listDriverPaths(const char* tag, const DriverPathStrings& strings,
+                    std::vector<std::string>& driverPaths);
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

@@ -12,7 +12,11 @@
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 namespace {
+
 constexpr const char* kLogTag = "wifi@1.0-Qca639xTestSuit.qca639x";
+
+const DriverPathStrings strings;
+
 } // namespace
 
 Qca639xTestSuit::Qca639xTestSuit() {
@@ -28,7 +32,7 @@ Qca639xTestSuit::~Qca639xTestSuit() {
 }
 
 int Qca639xTestSuit::getDriverPaths() {
-    return listDriverPaths(kLogTag, &driverPaths);
+    return listDriverPaths(kLogTag, strings, driverPaths);
 }
 
 std::string Qca639xTestSuit::getBgRateIndex(const std::string& rate) {

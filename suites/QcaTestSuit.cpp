@@ -14,13 +14,12 @@ namespace {
 
 constexpr const char* kLogTag = "wifi@1.0-QcaTestSuit-qca";
 
-// The driver's module file, once one has been found. Belongs to the process.
-std::string FwPath;
+FirmwarePathStrings strings;
 
 } // namespace
 
 QcaTestSuit::QcaTestSuit() {
-    if (FwPath.empty() && getFwPath() != 0) {
+    if (strings.FwPath.empty() && getFwPath() != 0) {
         __android_log_print(ANDROID_LOG_ERROR, kLogTag, "cannot find wlan driver : %s",
                             "QcaTestSuit");
     }
@@ -32,7 +31,7 @@ QcaTestSuit::~QcaTestSuit() {
 }
 
 int QcaTestSuit::getFwPath() {
-    return findFwPath(kLogTag, &FwPath);
+    return findFwPath(kLogTag, strings);
 }
 
 std::string QcaTestSuit::getBgRateIndex(const std::string& rate) {
@@ -48,7 +47,7 @@ std::string QcaTestSuit::ParseReceivedPacketNum(const std::string& output) {
 }
 
 FirmwarePathOperations QcaTestSuit::operations() {
-    return {*this, kLogTag, kQcaChip, FwPath};
+    return {*this, kLogTag, kQcaChip, strings.FwPath};
 }
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

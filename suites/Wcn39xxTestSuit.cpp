@@ -14,13 +14,12 @@ namespace {
 
 constexpr const char* kLogTag = "wifi@1.0-Wcn39xxTestSuit.wcn39xx";
 
-// The driver's module file, once one has been found. Belongs to the process.
-std::string FwPath;
+FirmwarePathStrings strings;
 
 } // namespace
 
 Wcn39xxTestSuit::Wcn39xxTestSuit() {
-    if (FwPath.empty() && getFwPath() != 0) {
+    if (strings.FwPath.empty() && getFwPath() != 0) {
         __android_log_print(ANDROID_LOG_ERROR, kLogTag, "cannot find wlan driver : %s",
                             "Wcn39xxTestSuit");
     }
@@ -32,7 +31,7 @@ Wcn39xxTestSuit::~Wcn39xxTestSuit() {
 }
 
 int Wcn39xxTestSuit::getFwPath() {
-    return findFwPath(kLogTag, &FwPath);
+    return findFwPath(kLogTag, strings);
 }
 
 std::string Wcn39xxTestSuit::getBgRateIndex(const std::string& rate) {
@@ -48,7 +47,7 @@ std::string Wcn39xxTestSuit::ParseReceivedPacketNum(const std::string& output) {
 }
 
 FirmwarePathOperations Wcn39xxTestSuit::operations() {
-    return {*this, kLogTag, kWcn39xxChip, FwPath};
+    return {*this, kLogTag, kWcn39xxChip, strings.FwPath};
 }
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

@@ -12,7 +12,11 @@
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 namespace {
+
 constexpr const char* kLogTag = "wifi@1.0-Wcn6750TestSuit.wcn6750";
+
+const DriverPathStrings strings;
+
 } // namespace
 
 Wcn6750TestSuit::Wcn6750TestSuit() {
@@ -28,7 +32,7 @@ Wcn6750TestSuit::~Wcn6750TestSuit() {
 }
 
 int Wcn6750TestSuit::getDriverPaths() {
-    return listDriverPaths(kLogTag, &driverPaths);
+    return listDriverPaths(kLogTag, strings, driverPaths);
 }
 
 std::string Wcn6750TestSuit::getBgRateIndex(const std::string& rate) {

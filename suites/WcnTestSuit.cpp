@@ -17,8 +17,7 @@ namespace {
 
 constexpr const char* kLogTag = "wifi@1.0-WcnTestSuit.wcn";
 
-// The driver's module file, once one has been found. Belongs to the process.
-std::string FwPath;
+FirmwarePathStrings strings;
 
 // The rows that the operations share. The single tone names the driver without its ending.
 // clang-format off
@@ -57,17 +56,17 @@ const BondedChannel& bondedChannel(const std::string& bandwidth, bool vht) {
 
 /** Loads the driver in factory test mode. */
 Command loadForTest() {
-    return {"insmod", FwPath, "con_mode=5"};
+    return {"insmod", strings.FwPath, "con_mode=5"};
 }
 
 Command loadNormally() {
-    return {"insmod", FwPath};
+    return {"insmod", strings.FwPath};
 }
 
 } // namespace
 
 WcnTestSuit::WcnTestSuit() {
-    if (FwPath.empty() && getFwPath() != 0) {
+    if (strings.FwPath.empty() && getFwPath() != 0) {
         __android_log_print(ANDROID_LOG_ERROR, kLogTag, "cannot find wlan driver : %s",
                             "WcnTestSuit");
     }
@@ -214,7 +213,7 @@ int WcnTestSuit::enterTestMode() {
 // clang-format on
 
 int WcnTestSuit::getFwPath() {
-    return findFwPath(kLogTag, &FwPath);
+    return findFwPath(kLogTag, strings);
 }
 
 std::string WcnTestSuit::packetCount(const std::string& output) {

@@ -15,13 +15,21 @@ constexpr const char* kCandidates[] = {
         "/vendor/lib/modules/qca_cld3/qca_cld3_wlan.ko",
 };
 
+TEST(FirmwarePathStringsTest, BeginWithoutAModuleFile) {
+    const FirmwarePathStrings strings;
+    EXPECT_EQ("/etc/firmware/fw_bcmdhd_mfg.bin", strings.MfgFirmwarePath);
+    EXPECT_THAT(strings.FwPathCandidates, ::testing::ElementsAreArray(kCandidates));
+    EXPECT_EQ("", strings.FwPath);
+}
+
 TEST(FindFwPathTest, TakesTheFirstReadableCandidate) {
     for (size_t first = 0; first < std::size(kCandidates); ++first) {
         RecordedShell shell;
         for (size_t i = first; i < std::size(kCandidates); ++i) shell.readable(kCandidates[i]);
-        std::string fwPath = "before";
-        EXPECT_EQ(0, findFwPath("tag", &fwPath));
-        EXPECT_EQ(kCandidates[first], fwPath);
+        FirmwarePathStrings strings;
+        strings.FwPath = "before";
+        EXPECT_EQ(0, findFwPath("tag", strings));
+        EXPECT_EQ(kCandidates[first], strings.FwPath);
         EXPECT_EQ(std::vector<std::string>(kCandidates, kCandidates + first + 1), shell.probed());
         EXPECT_THAT(shell.log(), IsEmpty());
     }
@@ -30,9 +38,10 @@ TEST(FindFwPathTest, TakesTheFirstReadableCandidate) {
 TEST(FindFwPathTest, KeepsThePathWhenNoneIsReadable) {
     RecordedShell shell;
     shell.readable("/vendor/lib/modules/qca_cld3_other.ko");
-    std::string fwPath = "before";
-    EXPECT_EQ(-1, findFwPath("tag", &fwPath));
-    EXPECT_EQ("before", fwPath);
+    FirmwarePathStrings strings;
+    strings.FwPath = "before";
+    EXPECT_EQ(-1, findFwPath("tag", strings));
+    EXPECT_EQ("before", strings.FwPath);
     EXPECT_EQ(std::size(kCandidates), shell.probed().size());
     EXPECT_THAT(shell.log(), ElementsAre(error("tag", "getFwPath cannot find out FwPath")));
 }
@@ -49,7 +58,7 @@ TEST_F(ListDriverPathsTest, TakesTheFamilysFilesInTheDirectorysOrder) {
     mShell.directory("/vendor/lib/modules",
                      {".", "..", "qca_cld3_wlan.ko", "wlan.ko", "qca_cld3", "qca_cld3_",
                       "aqca_cld3_x.ko", "QCA_CLD3_x.ko", "qca_cld3_a"});
-    EXPECT_EQ(0, listDriverPaths("tag", &mPaths));
+    EXPECT_EQ(0, listDriverPaths("tag", {}, mPaths));
     EXPECT_THAT(mPaths,
                 ElementsAre("/vendor/lib/modules/qca_cld3_wlan.ko", "/vendor/lib/modules/qca_cld3_",
                             "/vendor/lib/modules/qca_cld3_a"));
@@ -66,24 +75,24 @@ TEST_F(ListDriverPathsTest, TakesHundredsOfFilesOfAnyName) {
         paths.push_back("/vendor/lib/modules/" + names.back());
     }
     mShell.directory("/vendor/lib/modules", names);
-    EXPECT_EQ(0, listDriverPaths("tag", &mPaths));
+    EXPECT_EQ(0, listDriverPaths("tag", {}, mPaths));
     EXPECT_EQ(paths, mPaths);
 }
 
 TEST_F(ListDriverPathsTest, FailsSilentlyWithoutTheDirectory) {
     mShell.directory("/vendor/lib", {"qca_cld3_wlan.ko"});
     mPaths = {"before"};
-    EXPECT_EQ(-1, listDriverPaths("tag", &mPaths));
+    EXPECT_EQ(-1, listDriverPaths("tag", {}, mPaths));
     EXPECT_THAT(mPaths, ElementsAre("before"));
     EXPECT_THAT(mShell.log(), IsEmpty());
 }
 
 TEST_F(ListDriverPathsTest, FailsWhenThereIsNoPathThen) {
     mShell.directory("/vendor/lib/modules", {"wlan.ko"});
-    EXPECT_EQ(-1, listDriverPaths("tag", &mPaths));
+    EXPECT_EQ(-1, listDriverPaths("tag", {}, mPaths));
     EXPECT_THAT(mPaths, IsEmpty());
     mPaths = {"before"};
-    EXPECT_EQ(0, listDriverPaths("tag", &mPaths));
+    EXPECT_EQ(0, listDriverPaths("tag", {}, mPaths));
     EXPECT_THAT(mPaths, ElementsAre("before"));
 }
 
