@@ -25,29 +25,54 @@ function(program name)
     target_link_libraries(${name} PRIVATE ${PROGRAM_DEPENDS} ${EVERY_PROGRAM_DEPENDS})
 endfunction()
 
-# unit_test(<name> [STANDALONE] SOURCES <files>... DEPENDS <targets>...): a GoogleTest program, each
-# test known to CTest by itself.
-function(unit_test name)
+# test_program(<name> [STANDALONE] SOURCES <files>... DEPENDS <targets>...): a program of GoogleTest
+# cases. Its own code need not be fast but quick to build; OPTIMISE_TESTS is for warnings that g++ gives
+# only where it optimises.
+function(test_program name)
     program(${name} ${ARGN})
-    math(EXPR timeout "60 * ${TIMEOUT_FACTOR}")
+    if(OPTIMISE_TESTS)
+        target_compile_options(${name} PRIVATE -O1)
+    else()
+        target_compile_options(${name} PRIVATE -O0)
+    endif()
+    target_link_libraries(${name} PRIVATE GTest::gmock)
+    if(NOT TARGET test-headers)
+        # GoogleTest's headers, read once for all programs.
+        file(GENERATE OUTPUT ${PROJECT_BINARY_DIR}/test-headers.cpp CONTENT "")
+        add_library(test-headers OBJECT ${PROJECT_BINARY_DIR}/test-headers.cpp)
+        get_target_property(options ${name} COMPILE_OPTIONS)
+        target_compile_options(test-headers PRIVATE ${options})
+        target_link_libraries(test-headers PRIVATE GTest::gmock)
+        target_precompile_headers(test-headers PRIVATE <gmock/gmock.h>)
+    endif()
+    target_precompile_headers(${name} REUSE_FROM test-headers)
+endfunction()
+
+# unit_test(...): the same, run as one test. GTEST_FILTER in the environment chooses among its cases.
+function(unit_test name)
+    test_program(${name} ${ARGN})
+    math(EXPR timeout "300 * ${TIMEOUT_FACTOR}")
     target_link_libraries(${name} PRIVATE GTest::gmock_main)
     get_target_property(type ${name} TYPE)
     if(type STREQUAL EXECUTABLE)
-        gtest_discover_tests(
-            ${name} TEST_PREFIX ${name}. DISCOVERY_MODE PRE_TEST PROPERTIES TIMEOUT ${timeout}
-        )
+        add_test(NAME ${name} COMMAND ${name} --gtest_brief=1)
+        set_tests_properties(${name} PROPERTIES TIMEOUT ${timeout})
     endif()
 endfunction()
 
-# process_test(<name> <file>... [TIMEOUT <seconds>] [ENVIRONMENT <NAME=value>...]): pytest files that
-# drive whole programs. Left out where there are none that this machine runs as they stand.
+# process_test(<name> <file>... [COST <seconds>] [TIMEOUT <seconds>] [ENVIRONMENT <NAME=value>...]):
+# pytest files that drive whole programs. Left out where there are none that this machine runs as they
+# stand. CTest starts first what has the highest COST.
 function(process_test name)
     if(OTHER_CXX_LIBRARY OR CMAKE_CROSSCOMPILING)
         return()
     endif()
-    cmake_parse_arguments(TEST "" "TIMEOUT" "ENVIRONMENT" ${ARGN})
+    cmake_parse_arguments(TEST "" "COST;TIMEOUT" "ENVIRONMENT" ${ARGN})
     if(NOT TEST_TIMEOUT)
         set(TEST_TIMEOUT 900)
+    endif()
+    if(NOT TEST_COST)
+        set(TEST_COST 10)
     endif()
     math(EXPR TEST_TIMEOUT "${TEST_TIMEOUT} * ${TIMEOUT_FACTOR}")
     list(TRANSFORM TEST_UNPARSED_ARGUMENTS PREPEND ${CMAKE_CURRENT_SOURCE_DIR}/)
@@ -55,6 +80,17 @@ function(process_test name)
                                   ${TEST_UNPARSED_ARGUMENTS}
     )
     set_tests_properties(
-        ${name} PROPERTIES ENVIRONMENT "${TEST_ENVIRONMENT}" TIMEOUT ${TEST_TIMEOUT}
+        ${name} PROPERTIES ENVIRONMENT "${TEST_ENVIRONMENT}" TIMEOUT ${TEST_TIMEOUT} COST ${TEST_COST}
     )
+endfunction()
+
+# process_tests(<folder> [ENVIRONMENT <NAME=value>...]): every test_*.py of a folder as a test of its
+# own, <folder>.<name>, so that they run beside each other; without the ones called test_faults_*.
+function(process_tests folder)
+    file(GLOB files CONFIGURE_DEPENDS RELATIVE ${CMAKE_CURRENT_SOURCE_DIR} ${folder}/test_*.py)
+    list(FILTER files EXCLUDE REGEX "/test_faults_")
+    foreach(file ${files})
+        string(REGEX REPLACE ".*/test_(.*)\\.py" "\\1" name ${file})
+        process_test(${folder}.${name} ${file} COST 30 ${ARGN})
+    endforeach()
 endfunction()

@@ -18,9 +18,8 @@ endif()
 
 if(SANITIZE)
     # The instrumentation hides from g++ 12 that the standard library's own code sets what it reads.
-    # Functions and lines are what a report shows, and all of -g takes half as long again to build.
     add_compile_options(
-        -fsanitize=${SANITIZERS} -fno-sanitize-recover=all -fno-omit-frame-pointer -O1 -g1
+        -fsanitize=${SANITIZERS} -fno-sanitize-recover=all -fno-omit-frame-pointer -O1
         -Wno-maybe-uninitialized
     )
     add_link_options(-fsanitize=${SANITIZERS})

@@ -3,6 +3,3 @@
 """Every test here has simulated phones at hand: see support/phone.py."""
 
 from support.phone import make_phone_fixture  # noqa: F401  (pytest finds the fixture here)
-
-# Long ones, which CTest runs beside the others.
-collect_ignore_glob = ["test_faults_*.py", "test_overlap.py"]
