@@ -9,6 +9,9 @@ set(HIDL_ROOTS -r vendor.korvan.bex.wifi:${PROJECT_SOURCE_DIR}/interface -r
 )
 set(HIDL_OUTPUT ${PROJECT_BINARY_DIR}/hidl)
 
+# All that is generated, for a tool that reads the sources and builds nothing.
+add_custom_target(generated)
+
 function(hidl_package target)
     cmake_parse_arguments(HIDL "" "PACKAGE" "SOURCES;GENERATED" ${ARGN})
     string(REGEX REPLACE "[.@]" "/" folder ${HIDL_PACKAGE})
@@ -30,6 +33,8 @@ function(hidl_package target)
         VERBATIM
     )
 
+    add_custom_target(${target}-generated DEPENDS ${HIDL_GENERATED})
+    add_dependencies(generated ${target}-generated)
     add_library(${target} STATIC ${HIDL_GENERATED})
     # Not ours to mend: warnings in generated code are hidl-gen's.
     target_compile_options(${target} PRIVATE -w)
