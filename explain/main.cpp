@@ -1,10 +1,18 @@
 // Copyright 2026 The BEX Wi-Fi Authors
 // SPDX-License-Identifier: Apache-2.0
 
-// Prints the command lines that a call would run, one a line, without running any. The phone is the
-// file tree in HIDL_HOST_ROOT: its vendor/build.prop names the chip, and the suites find the module
-// files that it holds.
+// Prints the command lines that calls would run, one a line, without running any:
+//
+//     explain METHOD [ARGUMENT]...   those of one call
+//     explain -                      those of each line of stdin, whose words a tab separates; an
+//                                    empty line ends each answer
+//     explain methods                no call: the interface's methods, as the client lists them
+//     explain family                 no call: the name of the phone's chip family
+//
+// The phone is the file tree in HIDL_HOST_ROOT: its vendor/build.prop names the chip, and the
+// suites find the module files that it holds.
 
+#include <android-base/strings.h>
 #include <stdlib.h>
 
 #include <filesystem>
@@ -12,12 +20,18 @@
 #include <map>
 
 #include "client/Commands.h"
+#include "client/Help.h"
+#include "client/doctor/PhoneChecks.h"
 #include "recorder/RecordedShell.h"
 #include "service/WifiService.h"
 
 namespace implementation = vendor::korvan::bex::wifi::V1_0::implementation;
 using ::android::sp;
+using ::android::base::Split;
+using ::vendor::korvan::bex::wifi::ChipFamily;
 using ::vendor::korvan::bex::wifi::client::Answer;
+using ::vendor::korvan::bex::wifi::client::listJson;
+using ::vendor::korvan::bex::wifi::client::phoneFamily;
 using ::vendor::korvan::bex::wifi::client::readRequest;
 using ::vendor::korvan::bex::wifi::client::Request;
 using ::vendor::korvan::bex::wifi::V1_0::IWifiService;
@@ -47,14 +61,58 @@ void show(const Modules& modules, recorder::RecordedShell& shell) {
     }
 }
 
+enum class Outcome { failed, noCommand, explained };
+
+/** Prints the lines of a call, and forgets them. */
+Outcome explain(IWifiService& service, const Request& request, recorder::RecordedShell& shell) {
+    const Answer answer = request.command->call(service, request.values);
+    const std::vector<std::string> lines = shell.lines();
+    for (const std::string& line : lines) std::cout << line << '\n';
+    shell.clear();
+    if (!answer.delivered) return Outcome::failed;
+    return lines.empty() ? Outcome::noCommand : Outcome::explained;
+}
+
+int explainEachLine(IWifiService& service, recorder::RecordedShell& shell) {
+    std::string line;
+    for (int number = 1; std::getline(std::cin, line); ++number) {
+        Request request;
+        std::string problem;
+        if (!readRequest(Split(line, "\t"), &request, &problem)) {
+            std::cerr << "explain: line " << number << ": " << problem << '\n';
+            return 2;
+        }
+        if (explain(service, request, shell) == Outcome::failed) return 1;
+        std::cout << '\n';
+    }
+    return 0;
+}
+
 } // namespace
 
 int main(int argc, char** argv) {
+    const std::vector<std::string> words(argv + 1, argv + argc);
+    if (words == std::vector<std::string>{"methods"}) {
+        std::cout << listJson();
+        return 0;
+    }
+    const bool family = words == std::vector<std::string>{"family"};
+    const bool eachLine = words == std::vector<std::string>{"-"};
     Request request;
     std::string problem = "usage: explain METHOD [ARGUMENT]...";
-    if (argc < 2 || !readRequest({argv + 1, argv + argc}, &request, &problem)) {
+    if (!family && !eachLine && (words.empty() || !readRequest(words, &request, &problem))) {
         std::cerr << "explain: " << problem << '\n';
         return 2;
+    }
+
+    const ChipFamily* known = phoneFamily();
+    if (known == nullptr) {
+        std::cerr << "explain: the property ro.hardware.wlan.vendor names no known vendor\n";
+        return 1;
+    }
+    if (family) {
+        std::cout << known->name << '\n';
+        return 0;
     }
 
     const char* root = getenv("HIDL_HOST_ROOT");
@@ -63,12 +121,8 @@ int main(int argc, char** argv) {
     recorder::RecordedShell shell;
     show(modules, shell);
     const sp<IWifiService> service = new implementation::WifiService();
-    if (implementation::vendorTestSuit == nullptr) {
-        std::cerr << "explain: the property ro.hardware.wlan.vendor names no known vendor\n";
-        return 1;
-    }
-    const Answer answer = request.command->call(*service, request.values);
-    for (const std::string& line : shell.lines()) std::cout << line << '\n';
-    if (shell.lines().empty()) std::cerr << "explain: the call runs no command\n";
-    return answer.delivered ? 0 : 1;
+    if (eachLine) return explainEachLine(*service, shell);
+    const Outcome outcome = explain(*service, request, shell);
+    if (outcome == Outcome::noCommand) std::cerr << "explain: the call runs no command\n";
+    return outcome == Outcome::failed ? 1 : 0;
 }

@@ -1,18 +1,20 @@
-#!/usr/bin/python3
+#!/usr/bin/python3 -B
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
-"""Writes the command catalogue, docs/commands/, from the running code: catalogue.py [--check] EXPLAIN.
+"""Writes down what the running code does with each call: catalogue.py [--check] EXPLAIN.
 
-EXPLAIN is the built explain program. For every simulated phone and every method there is a section
-with the command lines of typical calls. With --check nothing is written, and the exit code tells
-whether the catalogue is up to date.
+EXPLAIN is the built explain program. For every simulated phone there is a page in docs/commands/
+with the command lines of typical calls and what becomes of each argument. With --check nothing is
+written, and the exit code tells whether all of that is up to date.
 """
 
-import os
 import pathlib
-import subprocess
 import sys
 import tempfile
+
+import argument_use
+import code_tables
+import explained
 
 ROOT = pathlib.Path(__file__).resolve().parents[1]
 CATALOGUE = ROOT / "docs" / "commands"
@@ -41,74 +43,148 @@ CALLS = [
     ["RunRxStop", "36"],
 ]
 
+# Names of chips beside those of the simulated phones, for the case of their letters.
+OTHER_NAMES = {"wcn": "wcn3990", "qca": "qca6174", "qca639x": "QCA639X", "wcn685x": "WCN685X",
+               "wcn6750": "WCN6750"}
 
-def run(*command, root=None):
-    environment = {**os.environ, "HIDL_HOST_ROOT": str(root)}
-    return subprocess.run(command, env=environment, check=True, stdout=subprocess.PIPE,
-                          stderr=subprocess.PIPE, text=True).stdout
+INTRODUCTION = """\
+# Command catalogue
+
+What the service runs, to read beside the manual of the chip's tool (`wl`, `myftm`, or the driver's
+private commands through `iwpriv`). One page for each chip family:
+
+{pages}
+
+For other arguments: `./dev explain CHIP METHOD ARGUMENT...`
+
+## How to read a page
+
+Each method has the lines that its arguments reach, a table of what becomes of each argument, and
+typical calls with every line that they run, in order. In the lines, all else stands as it is:
+
+- `<power>` is the argument as it was given, unchecked: `15`, `-3` and `loud` all get there. What it
+  means, its unit and its range are in the tool's manual.
+- `{{channel}}` is a code that the service makes of the argument. The tables under *Codes*, at the
+  end of the page, have all of them. `{{bandwidth, vht}}` depends on both.
+- An argument that is **ignored** may have any value; nothing in the lines changes.
+
+The service refuses no value and leaves no line out: the tool gets the line and decides. So a wrong
+rate or width shows on the air, or as the tool's exit code, which the service answers with -1 or
+`failure`. Before a measurement, look here for three things:
+
+1. Is the argument used at all? A power that is ignored leaves the chip at its own.
+2. Which code stands for the value, and which one for a value that no table has?
+3. Does the method start anything? Where a page says *Transmits nothing* or *Receives nothing*, the
+   call succeeds and the air stays quiet.
+
+## Which family a chip belongs to
+
+`ro.hardware.wlan.vendor` names the vendor, and a part of `ro.hardware.wlan.chip` the family. Upper
+and lower case differ: `{upper}` and `{lower}` are driven in different ways.
+
+{families}
+
+## How the pages come about
+
+`./dev catalogue` writes them: it has the service's own code make the lines of many calls that
+differ in one argument, runs none, and compares. A test fails when a page and the code disagree.
+"""
 
 
-def explained(explain, root, call):
-    """The command lines of a call. Modules come in the order of their folder, which the file system
-    makes up: here they are sorted."""
-    lines = run(explain, *call, root=root).splitlines()
-    modules = iter(sorted(line for line in lines if "insmod " in line))
-    return [next(modules) if "insmod " in line else line for line in lines]
+def argument_rows(use):
+    """For each argument where it gets to."""
+    found = []
+    for argument in use.method.arguments:
+        places = []
+        for line, place, slot in use.slots():
+            if argument.name in slot.arguments:
+                where = code_tables.code(code_tables.context(line, place))
+                how = "as it stands" if slot.template else "a [code](#codes)"
+                places.append(f"{where}: {how}")
+        found.append([argument.name, ", ".join(dict.fromkeys(places)) or "**ignored**"])
+    return found
 
 
-def page(explain, chip, root):
-    properties = dict(line.split("=", 1) for line in (root / "vendor/build.prop").read_text()
-                      .splitlines() if "=" in line)
+def arguments_text(use):
+    if not use.method.arguments:
+        return []
+    text = []
+    if use.lines:
+        text += ["", "```text", *[" ".join(map(str, line)) for line in use.lines], "```"]
+    text += ["", *code_tables.markdown(["argument", "where it gets to"], argument_rows(use))]
+    if use.remarks():
+        text += ["", *[f"- {remark}" for remark in use.remarks()]]
+    return text
+
+
+def page(chip, phone, uses):
     text = [f"# {chip}", "",
             "The command lines that each call runs, in order, on a phone with",
-            f"`ro.hardware.wlan.vendor` = `{properties['ro.hardware.wlan.vendor']}` and "
-            f"`ro.hardware.wlan.chip` = `{properties['ro.hardware.wlan.chip']}`.",
-            "Between quotes, since their blanks count. Written by `./dev catalogue`; do not edit."]
-    method = ""
-    for call in CALLS:
-        if call[0] != method:
-            method = call[0]
-            text += ["", f"## {method}"]
-        text += ["", f"`{' '.join(call)}`", ""]
-        lines = explained(explain, root, call)
-        text += ["```text", *[f'"{line}"' for line in lines], "```"] if lines else ["No command."]
-    return "\n".join(text) + "\n"
+            f"`ro.hardware.wlan.vendor` = `{phone.value('ro.hardware.wlan.vendor')}` and "
+            f"`ro.hardware.wlan.chip` = `{phone.value('ro.hardware.wlan.chip')}`;",
+            "[how to read them](README.md). Whole lines stand between quotes: their blanks count.",
+            "Written by `./dev catalogue`; do not edit."]
+    answers = dict(zip(map(tuple, CALLS), phone.lines(CALLS)))
+    tables = code_tables.CodeTables()
+    for use in uses:
+        tables.add(use)
+        text += ["", f"## {use.method.name}", *arguments_text(use)]
+        for call, lines in answers.items():
+            if call[0] == use.method.name:
+                text += ["", f"`{' '.join(call)}`", ""]
+                text += (["```text", *[f'"{line}"' for line in lines], "```"] if lines
+                         else ["No command."])
+    return "\n".join([*text, "", "## Codes", "", *tables.text()]).rstrip("\n") + "\n"
 
 
-def index(chips):
-    return "\n".join([
-        "# Command catalogue", "",
-        "What each call runs, to read beside the manual of the chip's tool. One page per chip family:",
-        "", *[f"- [{chip}]({chip}.md)" for chip in chips], "",
-        "For other arguments: `./dev explain CHIP METHOD ARGUMENT...`", ""])
+def families(phones):
+    """Which family each of some names belongs to, the letters' case being turned round in some."""
+    rows = []
+    for name, phone in phones.items():
+        own = phone.value("ro.hardware.wlan.chip")
+        for chip in [own] + [other for key, other in OTHER_NAMES.items() if key == name]:
+            vendor = phone.value("ro.hardware.wlan.vendor")
+            family = phone.with_chip(chip).family()
+            rows.append([f"`{vendor}`", f"`{chip}`", f"[{family}]({family}.md)"])
+        phone.with_chip(own)
+    return code_tables.markdown(["vendor", "chip", "family"], rows)
 
 
-def pages(explain):
-    chips = sorted(path.name for path in (ROOT / "simulator" / "phones").iterdir())
-    found = {"README.md": index(chips)}
+def index(phones):
+    own = phones["wcn"].value("ro.hardware.wlan.chip")
+    return INTRODUCTION.format(
+        pages="\n".join(f"- [{chip}]({chip}.md)" for chip in phones),
+        families="\n".join(families(phones)), upper=own, lower=OTHER_NAMES["wcn"])
+
+
+def wanted_files(explain):
+    """The text of every file, by its path."""
     with tempfile.TemporaryDirectory() as folder:
-        for chip in chips:
-            phone = pathlib.Path(folder) / chip
-            run(ROOT / "simulator" / "phone", "create", chip, phone)
-            found[f"{chip}.md"] = page(explain, chip, phone / "root")
+        phones = explained.phones(explain, folder)
+        methods = explained.methods(explain)
+        uses = {name: [argument_use.MethodUse(phone, method) for method in methods]
+                for name, phone in phones.items()}
+        found = {CATALOGUE / f"{name}.md": page(name, phone, uses[name])
+                 for name, phone in phones.items()}
+        found[CATALOGUE / "README.md"] = index(phones)
     return found
 
 
 def main():
     *options, explain = sys.argv[1:]
-    written = {path.name: path.read_text() for path in CATALOGUE.glob("*.md")}
-    wanted = pages(explain)
+    wanted = wanted_files(explain)
+    written = {path: path.read_text() for path in CATALOGUE.glob("*.md")}
     if options == ["--check"]:
-        stale = sorted(name for name in written.keys() | wanted.keys()
-                       if written.get(name) != wanted.get(name))
+        stale = sorted(path.name for path in written.keys() | wanted.keys()
+                       if written.get(path) != wanted.get(path))
         if stale:
             sys.exit(f"out of date, run ./dev catalogue: {', '.join(stale)}")
         return
     CATALOGUE.mkdir(parents=True, exist_ok=True)
-    for name in written.keys() - wanted.keys():
-        (CATALOGUE / name).unlink()
-    for name, text in wanted.items():
-        (CATALOGUE / name).write_text(text)
+    for path in written.keys() - wanted.keys():
+        path.unlink()
+    for path, text in wanted.items():
+        path.write_text(text)
 
 
 if __name__ == "__main__":
