@@ -9,8 +9,10 @@
 #include <cstring>
 
 #include "client/Arguments.h"
+#include "client/FamilyHelp.h"
 #include "client/Help.h"
 #include "client/base/Json.h"
+#include "client/doctor/PhoneChecks.h"
 
 namespace vendor::korvan::bex::wifi::client {
 namespace {
@@ -175,7 +177,7 @@ int help(const CommandLine& line, const Surroundings& to) {
     if (!method) return print(to, helpText());
     const Command* command = findCommand(line.words[0]);
     if (command == nullptr) return wrongUsage(to, unknownCommand(line.words[0]));
-    return print(to, helpText(*command));
+    return print(to, helpText(*command) + familyHelp(phoneFamily(), *command));
 }
 
 int call(const CommandLine& line, const Surroundings& to) {

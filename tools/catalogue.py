@@ -4,8 +4,9 @@
 """Writes down what the running code does with each call: catalogue.py [--check] EXPLAIN.
 
 EXPLAIN is the built explain program. For every simulated phone there is a page in docs/commands/
-with the command lines of typical calls and what becomes of each argument. With --check nothing is
-written, and the exit code tells whether all of that is up to date.
+with the command lines of typical calls and what becomes of each argument; what surprises there also
+goes into the table of the client's help. With --check nothing is written, and the exit code tells
+whether all of that is up to date.
 """
 
 import pathlib
@@ -15,9 +16,11 @@ import tempfile
 import argument_use
 import code_tables
 import explained
+import method_use_table
 
 ROOT = pathlib.Path(__file__).resolve().parents[1]
 CATALOGUE = ROOT / "docs" / "commands"
+TABLE = ROOT / "chips" / "MethodUseTable.cpp"
 
 # Typical calls: both bands, both standards, each width.
 CALLS = [
@@ -76,6 +79,8 @@ rate or width shows on the air, or as the tool's exit code, which the service an
 2. Which code stands for the value, and which one for a value that no table has?
 3. Does the method start anything? Where a page says *Transmits nothing* or *Receives nothing*, the
    call succeeds and the air stays quiet.
+
+`bex-wifi-client METHOD --help` tells on a phone what its own family ignores, from the same source.
 
 ## Which family a chip belongs to
 
@@ -167,13 +172,15 @@ def wanted_files(explain):
         found = {CATALOGUE / f"{name}.md": page(name, phone, uses[name])
                  for name, phone in phones.items()}
         found[CATALOGUE / "README.md"] = index(phones)
+        found[TABLE] = method_use_table.text(uses)
     return found
 
 
 def main():
     *options, explain = sys.argv[1:]
     wanted = wanted_files(explain)
-    written = {path: path.read_text() for path in CATALOGUE.glob("*.md")}
+    written = {path: path.read_text() for path in [*CATALOGUE.glob("*.md"), TABLE]
+               if path.exists()}
     if options == ["--check"]:
         stale = sorted(path.name for path in written.keys() | wanted.keys()
                        if written.get(path) != wanted.get(path))

@@ -24,7 +24,7 @@ def test_it_is_up_to_date():
 
 @pytest.fixture(name="copy")
 def copy_of_the_tree(tmp_path):
-    for folder in ("docs", "simulator", "tools"):
+    for folder in ("chips", "docs", "simulator", "tools"):
         shutil.copytree(ROOT / folder, tmp_path / folder)
     return tmp_path
 
@@ -41,9 +41,11 @@ def test_what_is_out_of_date_is_named(copy):
     page = copy / "docs/commands/qca.md"
     page.write_text(page.read_text().replace('"sleep 1 "', '"sleep 1"', 1))
     (copy / "docs/commands/broadcom.md").rename(copy / "docs/commands/acme.md")
+    (copy / "chips/MethodUseTable.cpp").unlink()
     stale = check(copy)
     assert stale.returncode == 1
-    assert stale.stderr == "out of date, run ./dev catalogue: acme.md, broadcom.md, qca.md\n"
+    assert stale.stderr == ("out of date, run ./dev catalogue: "
+                            "MethodUseTable.cpp, acme.md, broadcom.md, qca.md\n")
 
 
 def section(family, method):

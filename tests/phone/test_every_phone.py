@@ -73,3 +73,5 @@ def test_every_method(make_phone, chip):
         assert all("insmod " in line for line in failed), call
     methods = json.loads(phone.client("list", "--json").stdout)["methods"]
     assert {call[0] for call, _ in calls} == {method["name"] for method in methods}
+    explained = phone.client("RunTxAxStart", "--help").stdout.decode()
+    assert f"\nChip family of this phone: {chip}\n" in explained

@@ -1,0 +1,21 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#pragma once
+
+#include <string>
+
+#include "chips/ChipFamily.h"
+#include "client/Commands.h"
+
+namespace vendor::korvan::bex::wifi::client {
+
+/**
+ * What the help of a method adds on a phone: its chip family, which arguments that ignores, and
+ * what else surprises (chips/MethodUse.h). Ends in a newline.
+ *
+ * @param family Null for a phone that names no known vendor; then the text is empty.
+ */
+std::string familyHelp(const ChipFamily* family, const Command& command);
+
+} // namespace vendor::korvan::bex::wifi::client
