@@ -46,11 +46,13 @@ constexpr char kModeLog[] =
     "\"wifi@1.0-SnifferTool\")";
 
 constexpr ResultKind
-    kStatus{ResultKind::Type::int32, "0 when every command succeeded, -1 when at least one failed",
+    kStatus{ResultKind::Type::int32,
+            "0 when every command succeeded, -1 when at least one failed; some chip families tolerate "
+            "an insmod that fails",
             "-1", kCommandLog},
     kMode{ResultKind::Type::int32,
-          "0 (normal), 4 (monitor) or 5 (factory test); -1 for any other mode and when the mode "
-          "cannot be read", "-1", kModeLog},
+          "0 (normal), 4 (monitor) or 5 (factory test); -1 for any other number and when the mode "
+          "cannot be read; text that is no number reads as 0", "-1", kModeLog},
     kMonitor{ResultKind::Type::boolean,
              "true in monitor mode, and also when the driver's mode cannot be read", "", ""},
     kMimo{ResultKind::Type::boolean, "true when the device declares MIMO support", "", ""},
@@ -58,7 +60,8 @@ constexpr ResultKind
              "\"ok\" or \"failure\", or the packet count at the start, as the chip family defines",
              "failure", kCommandLog},
     kAxStarted{ResultKind::Type::text,
-               "\"ok\" or \"failure\"; one blank on chips that only reset", "failure", kCommandLog},
+               "\"ok\" or \"failure\"; one blank on the WCN chips, which only enter test mode",
+               "failure", kCommandLog},
     kPackets{ResultKind::Type::text,
              "the packets received, in decimal; on most Qualcomm chips with \"Rx: \" in front; no "
              "number when the chip's tool printed none", "failure", kCommandLog};

@@ -12,6 +12,7 @@ namespace vendor::korvan::bex::wifi::V1_0::implementation {
 /**
  * The radio tests of one chip family. Each operation runs a table of command lines for the chip's
  * tools, all of them even when one fails, and returns 0 when every one succeeded, else -1.
+ * The families that load every module of a folder tolerate an "insmod" that fails.
  *
  * Arguments are text and go into the command lines unchecked; which forms make sense is told at
  * IWifiService, which of them a family uses at its class. Operations that take `out` leave there

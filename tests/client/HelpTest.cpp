@@ -51,7 +51,9 @@ TEST(HelpTest, AMethodsHelpReadsLikeThis) {
               "Usage: bex-wifi-client [OPTION]... snifferStop\n"
               "Ends the packet capture and monitor mode; leaves the interface down.\n"
               "\n"
-              "Result (int32): 0 when every command succeeded, -1 when at least one failed\n");
+              "Result (int32): 0 when every command succeeded, -1 when at least one failed; some "
+              "chip "
+              "families tolerate an insmod that fails\n");
     EXPECT_EQ(helpText(*findCommand("RunRxNStart")),
               "Usage: bex-wifi-client [OPTION]... RunRxNStart channel bandwidth rate vht antenna\n"
               "Starts 802.11n or 802.11ac reception with a packet count, until RunRxStop.\n"

@@ -93,7 +93,7 @@ TEST_F(ServiceChecksTest, AServiceThatDied) {
 }
 
 TEST_F(ServiceChecksTest, Hash) {
-    expectOk("hash", "d225dbc8");
+    expectOk("hash", "14fe6273");
     mService->hashByte = 0;
     expectOnly("hash", "not frozen", "current.txt");
     mService->hashByte = 0xAB;

@@ -44,7 +44,7 @@ def test_this_checkout_agrees():
 DISAGREEMENTS = [
     (HAL, "package vendor.korvan.bex.wifi@1.0", "package vendor.korvan.bex.wifi@1.1",
      "vendor.korvan.bex.wifi@1.1 lies in interface/1.1/IWifiService.hal"),
-    ("interface/current.txt", "d225dbc8", "d225dbc9", "the definition's line is 'd225dbc8"),
+    ("interface/current.txt", "14fe6273", "14fe6274", "the definition's line is '14fe6273"),
     ("interface/Android.bp", 'name: "vendor.korvan.bex.wifi"', 'name: "vendor.korvan.bex"',
      "name is not 'vendor.korvan.bex.wifi'"),
     ("interface/Android.bp", "use_current: true", "use_current: false", "use_current is not 'True'"),
