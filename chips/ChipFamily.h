@@ -44,7 +44,7 @@ const std::vector<ChipFamily>& chipFamilies();
  *
  * @param vendor The phone's property ro.hardware.wlan.vendor.
  * @param chip The phone's property ro.hardware.wlan.chip.
- * @return The family, which lives for the whole process; null when the vendor is unknown.
+ * @return Null when the vendor is unknown.
  */
 const ChipFamily* findChipFamily(const std::string& vendor, const std::string& chip);
 

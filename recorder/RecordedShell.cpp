@@ -21,7 +21,7 @@ namespace recorder {
 
 namespace {
 
-/** A directory that is being read; stands behind the DIR* that the reader holds. */
+/** A directory that is being read: what the reader's DIR* points to. */
 struct Listing {
     std::vector<std::string> names;
     size_t next = 0;

@@ -10,8 +10,8 @@
 namespace recorder {
 
 /**
- * Stands in for the shell, the log and the files of a whole process: what the process would run is
- * written down and answered as told, and nothing runs; the files that it looks for are those told.
+ * Stands in for the shell, the log and the files of a whole process. Nothing runs: each command
+ * line is recorded, and its answer is the one that was set. The only files are those that were set.
  *
  * A program that links this library has popen, pclose, access, opendir, readdir, closedir and
  * __android_log_print of its own in front of the C library's and liblog's. They act on the one

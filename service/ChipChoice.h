@@ -10,7 +10,7 @@
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
-/** What drives a chip: makes the suite and the sniffer controller, which the caller owns. */
+/** What drives a chip: each makes a new object, for the caller to delete. */
 struct ChipChoice {
     VendorTestSuit* (*makeSuit)();
     SnifferTool* (*makeSniffer)();
@@ -19,7 +19,7 @@ struct ChipChoice {
 /**
  * Chooses what drives a phone's chip, by its family (chips/ChipFamily.h).
  *
- * @return The choice, which lives for the whole process; null when the vendor is unknown.
+ * @return Null when the vendor is unknown.
  */
 const ChipChoice* chooseChip(const std::string& vendor, const std::string& chip);
 

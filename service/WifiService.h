@@ -15,9 +15,9 @@ namespace vendor::korvan::bex::wifi::V1_0::implementation {
 using ::android::hardware::hidl_string;
 using ::android::hardware::Return;
 
-// What drives the phone's chip: chosen when a WifiService is made, null before, after its end, and
-// when the phone names no known vendor. Calls on the binder threads read them without a lock: they
-// are set before the service is registered and stay until it is gone.
+// What drives the phone's chip. A WifiService sets them when it is made and resets them at its end;
+// they stay null when the phone names no known vendor. Calls on the binder threads read them
+// without a lock: they are set before the service is registered.
 extern VendorTestSuit* vendorTestSuit;
 extern SnifferTool* snifferTool;
 

@@ -15,7 +15,7 @@ namespace vendor::korvan::bex::wifi::V1_0::implementation {
  * in several pieces), then the command line with "successful" (debug) or "unsuccessful" (error). A
  * shell that cannot be started is not logged.
  *
- * @param cmd The command line. The shell gets it as it stands, up to its first NUL.
+ * @param cmd The command line. The shell gets it unchanged, up to its first NUL.
  * @param tag The log tag of the caller.
  * @return The output; nothing when the command did not run or did not end with exit status 0.
  */

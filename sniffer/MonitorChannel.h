@@ -14,7 +14,7 @@ namespace vendor::korvan::bex::wifi::V1_0::implementation {
  * newer Qualcomm drivers want it.
  *
  * @param channel The IEEE 802.11 channel number in decimal.
- * @param bandwidth The channel width in MHz: exactly "20", "40" or "80"; all else is taken for 160.
+ * @param bandwidth The channel width in MHz: exactly "20", "40" or "80"; any other counts as 160.
  */
 Command setMonitorChannel(const std::string& channel, const std::string& bandwidth);
 

@@ -35,7 +35,7 @@ inline constexpr CaptureServices kByProperties = {
  */
 class SnifferTool {
   public:
-    /** What one command left behind. */
+    /** What became of one command. */
     struct CmdRunResult {
         /** 0 when the command ran and ended with exit status 0, else -1. */
         int32_t status = -1;
@@ -64,7 +64,7 @@ class SnifferTool {
     /** Tells whether the driver is in monitor mode; true also when its mode cannot be read. */
     virtual bool isSnifferMode();
 
-    /** Returns the driver's mode: 0 (normal), 4 (monitor), 5 (factory test), -1 for all else. */
+    /** Returns the driver's mode: 0 (normal), 4 (monitor), 5 (factory test), else -1. */
     virtual int getWlanMode();
 
     /** Runs one command line and collects its output in `result`; see runCommand. */

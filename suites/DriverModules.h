@@ -11,8 +11,8 @@
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
-// How a suite finds the kernel module files of its WLAN driver, and the strings for that, which
-// each suite's unit has for itself.
+// How a suite finds its driver's module files, and the strings for that: each suite's unit has its
+// own.
 
 /** The strings of a suite whose driver is one module file. */
 struct FirmwarePathStrings {

@@ -11,7 +11,7 @@
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
-/** What tells one chip family from another whose driver is every module file of the family. */
+/** What tells one chip family from another whose driver is several module files. */
 struct DriverPathChip {
     /** The option that chooses the chip's radios, before any test. */
     const char* radios;
@@ -34,17 +34,15 @@ inline constexpr DriverPathChip kWcn6750Chip = {"-B phya",  "0",     "0",    "-x
  * start reloads all of them in factory test mode and runs one myftm command, a stop reloads them
  * normally.
  *
- * Every line runs through the suite, which has operations of the same names, and is logged under
- * that name. A module that cannot be loaded fails RunRxStop only.
+ * Every line runs by the suite's runCmdCom, and is logged with the operation's name. A module that
+ * cannot be loaded fails RunRxStop only.
  */
 class DriverPathOperations {
   public:
     /**
-     * @param suit The suite whose operations these are. Outlives this object.
+     * @param suit The suite whose operations these are.
      * @param tag The suite's log tag.
-     * @param chip Lives for the whole process.
-     * @param driverPaths The driver's module files, in the order in which they load. Outlives this
-     *     object.
+     * @param driverPaths The driver's module files, in the order in which they load.
      */
     DriverPathOperations(VendorTestSuit& suit, const char* tag, const DriverPathChip& chip,
                          const std::vector<std::string>& driverPaths);
@@ -92,8 +90,8 @@ class DriverPathOperations {
 
     VendorTestSuit& mSuit;
     const char* const mTag;
-    const DriverPathChip& mChip;
-    const std::vector<std::string>& mDriverPaths;
+    const DriverPathChip mChip;
+    const std::vector<std::string> mDriverPaths;
 };
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

@@ -24,7 +24,7 @@ enum class DriverLoad {
     ThenTestMode,
 };
 
-/** What an 802.11b/g transmission is told, in the words of myftm. */
+/** The values of an 802.11b/g transmission, in the words of myftm. */
 struct BgTransmission {
     std::string antenna, frequency, rateIndex, protocolIndex, power;
 };
@@ -32,7 +32,7 @@ struct BgTransmission {
 /** What tells one chip family from another whose driver is one module file. */
 struct FirmwarePathChip {
     FirmwarePathTools tools;
-    /** How the driver is loaded for a test. A b/g reception has it ThenTestMode on every chip. */
+    /** How the driver is loaded for a test; for a b/g reception always ThenTestMode. */
     DriverLoad testLoad;
     /** How it is loaded for joining a network and for 802.11ax, where no test command follows. */
     DriverLoad idleLoad;
@@ -46,7 +46,6 @@ struct FirmwarePathChip {
     const char* addressUp;
 };
 
-// What each chip has there stands side by side in FirmwarePathOperations.cpp.
 extern const FirmwarePathChip kQcaChip;
 extern const FirmwarePathChip kWcn39xxChip;
 
@@ -55,17 +54,16 @@ extern const FirmwarePathChip kWcn39xxChip;
  * start reloads the driver in factory test mode and runs one myftm command, a stop reloads it
  * normally.
  *
- * Every line runs through the suite, which has operations of the same names. myftm has two commands
+ * Every line runs by the suite's runCmdCom. myftm has two commands
  * that end a test: -t 0 is for transmissions, -x 0 for receptions.
  */
 class FirmwarePathOperations {
   public:
     /**
-     * @param suit The suite whose operations these are. Outlives this object.
+     * @param suit The suite whose operations these are.
      * @param tag The suite's log tag.
-     * @param chip Lives for the whole process.
      * @param fwPath The driver's module file; empty when there is none, which ends the command that
-     *     loads it. Outlives this object.
+     *     loads it.
      */
     FirmwarePathOperations(VendorTestSuit& suit, const char* tag, const FirmwarePathChip& chip,
                            const std::string& fwPath);
@@ -98,8 +96,8 @@ class FirmwarePathOperations {
 
     VendorTestSuit& mSuit;
     const char* const mTag;
-    const FirmwarePathChip& mChip;
-    const std::string& mFwPath;
+    const FirmwarePathChip mChip;
+    const std::string mFwPath;
 };
 
 } // namespace vendor::korvan::bex::wifi::V1_0::implementation

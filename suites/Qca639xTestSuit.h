@@ -9,8 +9,8 @@
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 /**
- * The radio tests of the QCA639x family and of those that are tested like it; what they have in
- * common with Wcn6750TestSuit is told at DriverPathOperations. Uses every argument but one.
+ * The radio tests of the QCA639x family and of the chips that are tested like it.
+ * DriverPathOperations has what they share with Wcn6750TestSuit.
  */
 class Qca639xTestSuit : public VendorTestSuit {
   public:
@@ -38,7 +38,7 @@ class Qca639xTestSuit : public VendorTestSuit {
         return operations().RunTxStStart(channel, antenna);
     }
 
-    /** Is RunTxStop, also where a subclass has its own. */
+    /** Calls RunTxStop, a subclass's own if it has one. */
     int RunTxStStop(const std::string& channel) override { return RunTxStop(channel); }
     int RunTxStop(const std::string& channel) override { return operations().RunTxStop(channel); }
     int RunRxApJoinHoc(const std::string& ssid, const std::string& address) override {

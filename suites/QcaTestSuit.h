@@ -9,8 +9,7 @@
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 /**
- * The radio tests of QCA chips; what they have in common with Wcn39xxTestSuit is told at
- * FirmwarePathOperations.
+ * The radio tests of QCA chips. FirmwarePathOperations has what they share with Wcn39xxTestSuit.
  */
 class QcaTestSuit : public VendorTestSuit {
   public:
@@ -28,7 +27,7 @@ class QcaTestSuit : public VendorTestSuit {
         return operations().RunTxNStart(channel, bandwidth, mcs, power, vht, antenna);
     }
 
-    /** Is RunTxStop: it transmits nothing and uses no argument. */
+    /** Runs the commands of RunTxStop: it transmits nothing and uses no argument. */
     int RunTxAxStart(const std::string&, const std::string&, const std::string&, const std::string&,
                      const std::string&, const std::string&) override {
         return operations().RunTxAxStart();
@@ -40,7 +39,7 @@ class QcaTestSuit : public VendorTestSuit {
         return operations().RunTxStStart(channel, antenna);
     }
 
-    /** Is RunTxStop, also where a subclass has its own. */
+    /** Calls RunTxStop, a subclass's own if it has one. */
     int RunTxStStop(const std::string& channel) override { return RunTxStop(channel); }
     int RunTxStop(const std::string& /*channel*/) override { return operations().RunTxStop(); }
     int RunRxApJoinHoc(const std::string& ssid, const std::string& address) override {

@@ -9,8 +9,7 @@
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
-// How the test tools name a data rate. 802.11b/g/a rates come in Mbit/s ("5.5"); only the exact
-// text of a known rate counts, all else is taken for 1 Mbit/s.
+// How the test tools name a data rate. 802.11b/g/a rates come in Mbit/s, as exact texts: "5.5".
 
 /** myftm's rate index of an 802.11b/g/a rate, in decimal; unknown rates give that of 1 Mbit/s. */
 std::string bgRateIndex(const std::string& rate);
@@ -21,8 +20,7 @@ std::string abgProtocolIndex(const std::string& rate);
 /** The driver's name of an 802.11b/g/a rate; unknown rates give that of 1 Mbit/s. */
 std::string bgRateName(const std::string& rate);
 
-/** myftm's rate index of an 802.11n, ac or ax rate, in decimal: they follow each other from 15 on.
- */
+/** myftm's rate index of an 802.11n, ac or ax rate, in decimal: MCS 0 is 15, MCS 1 is 16. */
 std::string mcsRateIndex(const std::string& mcs);
 
 /** The driver's names of 802.11n or ac rates, from MCS 0 on; empty where there is no rate. */

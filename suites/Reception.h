@@ -9,22 +9,22 @@
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
-// What a reception tells the client. Every text that a tool prints goes through the suite's own
-// string tools.
+// What a reception tells the client. What a tool printed goes through the suite's string tools.
 
 /** What the start of a reception says: "ok" for status 0, else "failure". */
 std::string startWord(int status);
 
 /**
- * The packet count in what a counter command printed: all of it but the newlines and the label that
- * stands in front of the number.
+ * The packet count in what a counter command printed: all of it without the newlines and without
+ * the label before the number.
  */
 std::string countWithout(VendorTestSuit& suit, const std::string& label, const std::string& output);
 
 /**
- * The number of good packets in what myftm printed, newlines already turned into blanks: a field of
- * the text that begins with the last "goodPackets", counted from 0 and split at each single blank.
- * Without that field, which is logged as an error, that whole text; empty without the label.
+ * The number of good packets in what myftm printed, after its newlines became blanks. The text from
+ * the last "goodPackets" on is split at each blank; the number is one of its fields, counted from
+ * 0. When there are fewer fields, an error is logged and the result is that whole text; without the
+ * label it is empty.
  *
  *     goodPackets(suit, "wifi@1.0-example", 1, "goodPackets 12 badPackets 3 ") gives "12".
  *

@@ -14,16 +14,16 @@ namespace vendor::korvan::bex::wifi::V1_0::implementation {
  * tools, all of them even when one fails, and returns 0 when every one succeeded, else -1.
  * The families that load every module of a folder tolerate an "insmod" that fails.
  *
- * Arguments are text and go into the command lines unchecked; which forms make sense is told at
- * IWifiService, which of them a family uses at its class. Operations that take `out` leave there
- * the text for the client: a packet count or a status word.
+ * Arguments are text and go into the command lines unchecked. IWifiService says which forms make
+ * sense, and each class which arguments it does not use. Operations that take `out` leave there the
+ * text for the client: a packet count or a status word.
  *
  * A suite has no state of its own that an operation changes, so two threads may run two operations;
  * their commands then interleave on the same radio.
  */
 class VendorTestSuit {
   public:
-    /** What one command left behind. */
+    /** What became of one command. */
     struct CmdRunResult {
         /** 0 when the command ran and ended with exit status 0, else -1. */
         int32_t status = -1;
@@ -88,8 +88,8 @@ class VendorTestSuit {
      * none: ("a-b-c", "-", " ") gives "a b c", ("aaaab", "ab", "b") gives "b". Takes time in
      * proportion to the text and the number of replacements.
      *
-     * Does not end where every replacement makes room for another one: when `from` is in `src` and
-     * also in `to`, as an empty `from` always is, and for some other pairs, such as "ab" by "bbaa".
+     * Does not end when each replacement brings another occurrence: when `to` contains `from`, as
+     * it always does an empty one, and for some other pairs, such as "ab" by "bbaa".
      */
     virtual std::string replaceSubString(const std::string& src, const std::string& from,
                                          const std::string& to);

@@ -9,8 +9,7 @@
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 /**
- * The radio tests of WCN39xx chips; what they have in common with QcaTestSuit is told at
- * FirmwarePathOperations.
+ * The radio tests of WCN39xx chips. FirmwarePathOperations has what they share with QcaTestSuit.
  */
 class Wcn39xxTestSuit : public VendorTestSuit {
   public:
@@ -39,7 +38,7 @@ class Wcn39xxTestSuit : public VendorTestSuit {
         return operations().RunTxStStart(channel, antenna);
     }
 
-    /** Is RunTxStop, also where a subclass has its own. */
+    /** Calls RunTxStop, a subclass's own if it has one. */
     int RunTxStStop(const std::string& channel) override { return RunTxStop(channel); }
     int RunTxStop(const std::string& /*channel*/) override { return operations().RunTxStop(); }
     int RunRxApJoinHoc(const std::string& ssid, const std::string& address) override {

@@ -9,8 +9,7 @@
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 /**
- * The radio tests of the WCN6750; what they have in common with Qca639xTestSuit is told at
- * DriverPathOperations. Uses every argument but one.
+ * The radio tests of the WCN6750. DriverPathOperations has what they share with Qca639xTestSuit.
  */
 class Wcn6750TestSuit : public VendorTestSuit {
   public:
@@ -38,7 +37,7 @@ class Wcn6750TestSuit : public VendorTestSuit {
         return operations().RunTxStStart(channel, antenna);
     }
 
-    /** Is RunTxStop, also where a subclass has its own. */
+    /** Calls RunTxStop, a subclass's own if it has one. */
     int RunTxStStop(const std::string& channel) override { return RunTxStop(channel); }
     int RunTxStop(const std::string& channel) override { return operations().RunTxStop(channel); }
     int RunRxApJoinHoc(const std::string& ssid, const std::string& address) override {

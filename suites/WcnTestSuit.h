@@ -20,7 +20,8 @@ class WcnTestSuit : public VendorTestSuit {
     int RunTxBGStart(const std::string& channel, const std::string& rate, const std::string& power,
                      const std::string& antenna) override;
 
-    /** A width that the standard does not have is taken for 20 MHz. Does not use `antenna`. */
+    /** A width that the standard does not have counts as 802.11n, 20 MHz. Does not use `antenna`.
+     */
     int RunTxNStart(const std::string& channel, const std::string& bandwidth,
                     const std::string& mcs, const std::string& power, bool vht,
                     const std::string& antenna) override;
@@ -44,7 +45,7 @@ class WcnTestSuit : public VendorTestSuit {
     int RunRxBgStart(const std::string& channel, const std::string& rate,
                      const std::string& antenna, std::string& out) override;
 
-    /** Is RunRxBgStart, also where a subclass has its own. */
+    /** Calls RunRxBgStart, a subclass's own if it has one, with `mcs` for the rate. */
     int RunRxNStart(std::string channel, const std::string& bandwidth, const std::string& mcs,
                     bool vht, const std::string& antenna, std::string& out) override;
 

@@ -68,7 +68,7 @@ std::vector<std::string> pieces(const std::string& text, const std::string& sepa
             result.back() += text[position++];
         }
     }
-    // What stands behind the last separator is a piece only if it is something.
+    // What follows the last separator is a piece only if it is something.
     if (result.back().empty()) result.pop_back();
     return result;
 }

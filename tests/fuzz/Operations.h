@@ -55,7 +55,7 @@ struct Arguments {
     bool vht = false;
 };
 
-/** Reads the first `count` texts, and the bool behind them. */
+/** Reads the first `count` texts, and the bool after them. */
 Arguments readArguments(Input& input, size_t count);
 
 struct Operation {

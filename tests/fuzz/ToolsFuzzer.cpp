@@ -1,7 +1,7 @@
 // Copyright 2026 The BEX Wi-Fi Authors
 // SPDX-License-Identifier: Apache-2.0
 
-// The string tools and the packet counts, held against the model of their contracts. See
+// The string tools and the packet counts, compared with the model of their contracts. See
 // tests/fuzz/README.md.
 
 #include <memory>

@@ -221,7 +221,7 @@ Reply readReply(const Method& method, const Parcel& written) {
     }
     check(read, "a reply holds its result", std::string(1, method.result));
     check(method.result == '-' || parcel.dataPosition() == parcel.dataSize(),
-          "a reply holds nothing behind its result", std::to_string(parcel.dataSize()));
+          "a reply has nothing after its result", std::to_string(parcel.dataSize()));
     return reply;
 }
 

@@ -320,7 +320,7 @@ TEST_F(BrcmTestSuitTest, AFailedAxReceptionSaysFailure) {
     EXPECT_EQ("failure", mOut);
 }
 
-TEST_F(BrcmTestSuitTest, AStartHandsOverTheCountAlsoBehindAFailure) {
+TEST_F(BrcmTestSuitTest, AStartHandsOverTheCountAlsoAfterAFailure) {
     mShell.answer("wl band", failing());
     mShell.answer("counters", {"9\n"});
     EXPECT_EQ(-1, mSuit.RunRxBgStart("6", "", "1", mOut));

@@ -71,7 +71,7 @@ TYPED_TEST(FirmwarePathSuitsDeathTest, WorksWithoutADriver) {
                                 error(TypeParam::kTag, "cannot find wlan driver : " + name),
                                 debug(TypeParam::kTag, "function at: " + name)));
 
-        // The missing path ends the line, so the parameter behind it is lost too.
+        // The missing path ends the line, so the parameter after it is lost too.
         const std::string insmod = name == "Wcn39xxTestSuit" ? "/vendor/bin/insmod " : "insmod ";
         EXPECT_EQ(insmod, TestFixture::load(shell, suit));
     });

@@ -15,7 +15,7 @@ class WcnTestSuitTest : public ::testing::Test {
         mShell.clear();
     }
 
-    /** The words behind a private command in the last operation. */
+    /** The words after a private command in the last operation. */
     std::string wordsOf(const std::string& command) {
         const std::string start = "iwpriv wlan0 " + command + " ";
         std::string words;
