@@ -25,22 +25,24 @@ void work(const Request& request, const FindService& find, Shared* shared) {
     if (shared->answer.delivered) shared->stage = Stage::done;
 }
 
-Ending endingOf(const Waited& waited, const Shared& shared) {
+} // namespace
+
+void applyWait(const Waited& waited, Outcome* outcome) {
+    outcome->number = waited.number;
     switch (waited.end) {
-        case Waited::End::late:
-            return Ending::late;
-        case Waited::End::interrupted:
-            return Ending::interrupted;
-        case Waited::End::notStarted:
-            return Ending::notStarted;
         case Waited::End::done:
             break;
+        case Waited::End::late:
+            outcome->ending = Ending::late;
+            break;
+        case Waited::End::interrupted:
+            outcome->ending = Ending::interrupted;
+            break;
+        case Waited::End::notStarted:
+            outcome->ending = Ending::notStarted;
+            break;
     }
-    if (!shared.found) return Ending::notFound;
-    return shared.answer.delivered ? Ending::answered : Ending::transportFailed;
 }
-
-} // namespace
 
 Outcome callService(const Request& request, const FindService& find,
                     std::optional<std::chrono::nanoseconds> timeout, const Progress& progress) {
@@ -49,10 +51,14 @@ Outcome callService(const Request& request, const FindService& find,
     const Waited waited = waitFor([request, find, shared] { work(request, find, shared.get()); },
                                   timeout ? start + *timeout : kNever, progress);
     Outcome outcome;
-    outcome.ending = endingOf(waited, *shared);
     outcome.stage = shared->stage;
-    outcome.number = waited.number;
-    if (waited.end == Waited::End::done) outcome.answer = shared->answer;
+    if (waited.end == Waited::End::done) {
+        outcome.answer = shared->answer;
+        outcome.ending = !shared->found             ? Ending::notFound
+                         : outcome.answer.delivered ? Ending::answered
+                                                    : Ending::transportFailed;
+    }
+    applyWait(waited, &outcome);
     outcome.duration = Clock::now() - start;
     return outcome;
 }

@@ -50,6 +50,9 @@ struct Outcome {
     std::chrono::nanoseconds duration{};
 };
 
+/** Sets the ending of what was not waited for to its end. */
+void applyWait(const Waited& waited, Outcome* outcome);
+
 /**
  * Finds the service and makes the call. Returns when both are done, or, promptly, when the deadline
  * has passed or a signal has come.

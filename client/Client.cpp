@@ -3,14 +3,13 @@
 
 #include "client/Client.h"
 
-#include <android-base/stringprintf.h>
-
 #include <cerrno>
 #include <cstring>
 
 #include "client/Arguments.h"
 #include "client/FamilyHelp.h"
 #include "client/Help.h"
+#include "client/Stop.h"
 #include "client/base/Json.h"
 #include "client/doctor/PhoneChecks.h"
 
@@ -19,14 +18,11 @@ namespace {
 
 constexpr char kList[] = "list";
 constexpr char kDoctor[] = "doctor";
+constexpr char kStop[] = "stop";
 constexpr std::chrono::seconds kDoctorTimeout(5);
-
-/** A finished call as the user sees it. */
-struct Report {
-    int exitCode;
-    /** Why it is not kSuccess; empty when it is. */
-    std::string error;
-};
+constexpr std::chrono::seconds kStopTimeout(60);
+// The driver is reloaded or its interface taken down, whatever the channel.
+constexpr char kAnyChannel[] = "1";
 
 int fail(const Surroundings& to, int exitCode, const std::string& error) {
     to.err << "bex-wifi-client: " << error << std::endl;
@@ -47,54 +43,6 @@ int print(const Surroundings& to, const std::string& text) {
     return fail(to, kNotWritten, "cannot write the result to stdout" + reason);
 }
 
-Report judge(const Request& request, const Outcome& outcome) {
-    const std::string method = request.command->name;
-    switch (outcome.ending) {
-        case Ending::answered:
-            break;
-        case Ending::notFound:
-            return {kNoService,
-                    "vendor.korvan.bex.wifi@1.0::IWifiService/default is not registered: is "
-                    "vendor.korvan.bex.wifi@1.0-service running, is it in the VINTF manifest, and "
-                    "may this user find it?"};
-        case Ending::transportFailed:
-            return {kTransportFailed,
-                    method + " failed in the transport, the service may have died: see its log; " +
-                            jsonString(outcome.answer.transportError)};
-        case Ending::late:
-            if (outcome.stage == Stage::lookup) {
-                return {kTooLate,
-                        "vendor.korvan.bex.wifi@1.0-service has not answered in time: it may be "
-                        "busy with other calls or not running"};
-            }
-            return {kTooLate, "the deadline passed in " + method +
-                                      ": the service's commands may still be running"};
-        case Ending::interrupted:
-            return {kSignalled + outcome.number,
-                    method + " was interrupted by " + strsignal(outcome.number)};
-        case Ending::notStarted:
-            return {kTransportFailed, std::string("no thread can be started: ") +
-                                              strerror(outcome.number) + "; nothing was called"};
-    }
-    if (request.command->tellsFailure(outcome.answer)) {
-        return {kFailed, method + " answered " + outcome.answer.text + ": " +
-                                 request.command->result->advice};
-    }
-    return {kSuccess, ""};
-}
-
-std::string milliseconds(std::chrono::nanoseconds duration) {
-    const long long us = std::chrono::duration_cast<std::chrono::microseconds>(duration).count();
-    return ::android::base::StringPrintf("%lld.%03lld", us / 1000, us % 1000);
-}
-
-/** The object with the members that end every report. */
-std::string withEnding(JsonObject object, const Report& report) {
-    object.add("exit_code", std::to_string(report.exitCode));
-    if (!report.error.empty()) object.addText("error", report.error);
-    return object.str() + "\n";
-}
-
 /** Prints the text, then why it is not kSuccess. */
 int conclude(const Surroundings& to, const std::string& text, const Report& report) {
     const int written = print(to, text);
@@ -102,48 +50,30 @@ int conclude(const Surroundings& to, const std::string& text, const Report& repo
     return report.error.empty() ? kSuccess : fail(to, report.exitCode, report.error);
 }
 
-std::string jsonReport(const Request& request, const Outcome& outcome, const Report& report) {
-    JsonObject arguments;
-    for (size_t i = 0; i < request.values.size(); ++i) {
-        const ArgumentKind& kind = *request.command->arguments[i];
-        const Value& value = request.values[i];
-        if (kind.type == ArgumentKind::Type::boolean) {
-            arguments.add(kind.name, value.flag ? "true" : "false");
-        } else {
-            arguments.addText(kind.name, value.text);
-        }
-    }
-    bool exact = true;
-    std::string value = "null";
-    if (outcome.ending == Ending::answered) {
-        // Numbers and booleans are printed as JSON has them.
-        const bool text = request.command->result->type == ResultKind::Type::text;
-        value = text ? jsonString(outcome.answer.text, &exact) : outcome.answer.text;
-    }
-    JsonObject object;
-    object.add("schema_version", kSchemaVersion)
-            .addText("method", request.command->name)
-            .add("arguments", arguments.str())
-            .add("ok", report.exitCode == kSuccess ? "true" : "false")
-            .add("value", value);
-    if (!exact) object.addText("value_hex", hexDigits(outcome.answer.text));
-    object.add("duration_ms", milliseconds(outcome.duration));
-    return withEnding(object, report);
-}
-
-Outcome callWatched(const Request& request, const CommandLine& line, const Surroundings& to) {
+/**
+ * Waits as `wait` does, which gets what to do meanwhile: where somebody watches, show how long it
+ * has taken.
+ */
+template <typename Wait>
+auto watched(const std::string& doing, const Surroundings& to, Wait wait) {
     std::string shown;
     Progress progress{to.second, nullptr};
     if (to.terminal) {
         progress.tick = [&](long seconds) {
-            shown = std::string(request.command->name) + ": " + std::to_string(seconds) + " s";
+            shown = doing + ": " + std::to_string(seconds) + " s";
             to.err << '\r' << shown << std::flush;
         };
     }
-    Outcome outcome =
-            callService(request, line.timeout ? to.awaitFind : to.tryFind, line.timeout, progress);
+    auto result = wait(progress);
     if (!shown.empty()) to.err << '\r' << std::string(shown.size(), ' ') << '\r' << std::flush;
-    return outcome;
+    return result;
+}
+
+Outcome callWatched(const Request& request, const CommandLine& line, const Surroundings& to) {
+    return watched(request.command->name, to, [&](const Progress& progress) {
+        return callService(request, line.timeout ? to.awaitFind : to.tryFind, line.timeout,
+                           progress);
+    });
 }
 
 int list(const CommandLine& line, const Surroundings& to) {
@@ -172,8 +102,60 @@ int doctor(const CommandLine& line, const Surroundings& to) {
     return conclude(to, text, report);
 }
 
+Report judgeStop(const std::string& channel, const Stopped& stopped) {
+    if (stopped.off) return {};
+    const std::string again = stopCommandLine(channel);
+    Report report = judgeUnanswered("stop", stopped.outcome);
+    if (stopped.outcome.ending == Ending::answered) {
+        report = {kFailed,
+                  "the calls do not prove that the radio is off: which command failed is in the "
+                  "service's log (logcat, tags that begin with \"wifi@1.0-\")"};
+    } else if (stopped.outcome.ending == Ending::late && stopped.outcome.stage == Stage::call &&
+               !stopped.alone) {
+        report.error = "the deadline passed while waiting for another call to end";
+    }
+    report.error += "; the radio may be on, try again: " + again;
+    return report;
+}
+
+std::string stopText(const Stopped& stopped) {
+    std::string text;
+    for (const StopCall& call : stopped.calls) {
+        text += std::string(call.command->name) + ": " + call.answer.text + "\n";
+    }
+    return text + (stopped.off ? "the radio is off\n" : "the radio may be on\n");
+}
+
+std::string stopJson(const std::string& channel, const Stopped& stopped, const Report& report) {
+    JsonArray calls;
+    for (const StopCall& call : stopped.calls) {
+        const bool text = call.command->result->type == ResultKind::Type::text;
+        calls.add(JsonObject()
+                          .addText("method", call.command->name)
+                          .add("value", text ? jsonString(call.answer.text) : call.answer.text)
+                          .str());
+    }
+    JsonObject object = jsonHead(kStop, JsonObject().addText("channel", channel), report);
+    object.add("calls", calls.str());
+    addCourse(stopped.outcome, &object);
+    return withEnding(object, report);
+}
+
+int stop(const CommandLine& line, const Surroundings& to) {
+    if (line.words.size() > 2) return wrongUsage(to, "stop takes a channel at most", kStop);
+    const std::string channel = line.words.size() == 2 ? line.words[1] : kAnyChannel;
+    const ChipFamily* family = phoneFamily();
+    const Stopped stopped = watched(kStop, to, [&](const Progress& progress) {
+        return stopRadio(channel, family ? family->name : "", to.awaitFind,
+                         line.timeout.value_or(kStopTimeout), progress);
+    });
+    const Report report = judgeStop(channel, stopped);
+    return conclude(to, line.json ? stopJson(channel, stopped, report) : stopText(stopped), report);
+}
+
 int help(const CommandLine& line, const Surroundings& to) {
-    const bool method = !line.words.empty() && line.words[0] != kList && line.words[0] != kDoctor;
+    const bool method = !line.words.empty() && line.words[0] != kList && line.words[0] != kDoctor &&
+                        line.words[0] != kStop;
     if (!method) return print(to, helpText());
     const Command* command = findCommand(line.words[0]);
     if (command == nullptr) return wrongUsage(to, unknownCommand(line.words[0]));
@@ -208,6 +190,7 @@ int runClient(const std::vector<std::string>& arguments, const Surroundings& sur
     if (line.help) return help(line, surroundings);
     if (!line.words.empty() && line.words[0] == kList) return list(line, surroundings);
     if (!line.words.empty() && line.words[0] == kDoctor) return doctor(line, surroundings);
+    if (!line.words.empty() && line.words[0] == kStop) return stop(line, surroundings);
     return call(line, surroundings);
 }
 

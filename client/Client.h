@@ -9,32 +9,12 @@
 #include <vector>
 
 #include "client/Call.h"
+#include "client/Report.h"
 #include "client/doctor/Doctor.h"
 
 // The command line client, without a process around it.
 
 namespace vendor::korvan::bex::wifi::client {
-
-/**
- * What the client ends with. Its own codes are below 126, so that no shell mistakes one for its
- * own.
- */
-enum ExitCode {
-    kSuccess = 0,
-    /** The service answered -1 or "failure", or the doctor found a problem. */
-    kFailed = 1,
-    kWrongUsage = 2,
-    /** The service cannot be found. */
-    kNoService = 3,
-    /** The transport failed in the call, or there was no thread for it. */
-    kTransportFailed = 4,
-    /** The deadline passed. */
-    kTooLate = 5,
-    /** The result could not be written. */
-    kNotWritten = 6,
-    /** And the number of the signal that ended the wait for an answer, as shells have it. */
-    kSignalled = 128,
-};
 
 /** What the client needs from its surroundings. */
 struct Surroundings {

@@ -68,6 +68,8 @@ struct Command {
     const char* summary;
     std::vector<const ArgumentKind*> arguments;
     const ResultKind* result;
+    /** What goes on after the call, such as "the transmission"; empty where nothing does. */
+    const char* starts;
     /** Calls the method; takes as many values as there are arguments. Blocks until it answers. */
     Answer (*call)(IWifiService& service, const std::vector<Value>& values);
 

@@ -15,20 +15,22 @@ Usage:
   bex-wifi-client [OPTION]... METHOD [ARGUMENT]...   call a method and print what it answers
   bex-wifi-client METHOD --help                      explain a method and its arguments
   bex-wifi-client list [--json]                      name the methods
+  bex-wifi-client stop [--json] [CHANNEL]            end whatever the radio does
   bex-wifi-client doctor [--json]                    find out what keeps the service from working
 
 Options, before or after the method:
   --json             print one JSON object, on one line, whatever comes of the call
   --timeout SECONDS  wait for the service to start, and give up after SECONDS (such as 2.5)
                      altogether; without it the service must run, and may take its time. The
-                     doctor gives up after 5 seconds without it
+                     doctor gives up after 5 seconds without it, stop after 60
   --                 end of the options; needed before an argument that begins with "-", unless
                      it is a number
   --help             explain
 
 Exit codes:
   0  success
-  1  the service answered -1 or "failure"; the doctor found a problem
+  1  the service answered -1 or "failure"; the doctor found a problem; stop did not prove
+     that the radio is off
   2  wrong usage
   3  the service cannot be found
   4  the transport failed in the call

@@ -5,7 +5,6 @@
 
 #include <android-base/unique_fd.h>
 #include <poll.h>
-#include <pthread.h>
 #include <signal.h>
 #include <sys/eventfd.h>
 #include <sys/signalfd.h>
@@ -20,20 +19,6 @@ namespace {
 using ::android::base::unique_fd;
 
 constexpr std::chrono::nanoseconds kLongestPoll = std::chrono::hours(1);
-
-struct Task {
-    std::function<void()> work;
-    /** Becomes readable when the work is done. */
-    unique_fd done;
-};
-
-void* run(void* argument) {
-    const std::unique_ptr<std::shared_ptr<Task>> task(
-            static_cast<std::shared_ptr<Task>*>(argument));
-    (*task)->work();
-    eventfd_write((*task)->done.get(), 1);
-    return nullptr;
-}
 
 /** As long as it lives, the signals that would kill the process wait to be taken. */
 class HeldSignals {
@@ -79,11 +64,11 @@ void pollUntil(Clock::time_point wake, pollfd (&fds)[2]) {
     ppoll(fds, 2, &timeout, nullptr);
 }
 
-Waited watch(const Task& task, const HeldSignals& signals, Clock::time_point deadline,
+Waited watch(const Worker& worker, const HeldSignals& signals, Clock::time_point deadline,
              const Progress& progress) {
     using End = Waited::End;
     const Clock::time_point start = Clock::now();
-    pollfd fds[] = {{task.done.get(), POLLIN, 0}, {signals.fd(), POLLIN, 0}};
+    pollfd fds[] = {{worker.fd(), POLLIN, 0}, {signals.fd(), POLLIN, 0}};
     for (long tick = 1;;) {
         const Clock::time_point next = start + tick * progress.interval;
         pollUntil(std::min(deadline, next), fds);
@@ -98,23 +83,56 @@ Waited watch(const Task& task, const HeldSignals& signals, Clock::time_point dea
 
 } // namespace
 
+struct Worker::Task {
+    std::function<void()> work;
+    unique_fd done;
+};
+
+void* Worker::run(void* task) {
+    const std::unique_ptr<std::shared_ptr<Task>> shared(static_cast<std::shared_ptr<Task>*>(task));
+    (*shared)->work();
+    eventfd_write((*shared)->done.get(), 1);
+    return nullptr;
+}
+
+Worker::Worker(std::function<void()> work)
+      : mTask(std::make_shared<Task>(
+                Task{std::move(work), unique_fd(eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK))})) {
+    if (mTask->done.get() == -1) {
+        mError = errno;
+        return;
+    }
+    auto task = std::make_unique<std::shared_ptr<Task>>(mTask);
+    mError = pthread_create(&mThread, nullptr, run, task.get());
+    mRuns = mError == 0;
+    if (mRuns) static_cast<void>(task.release()); // the thread's from here on
+}
+
+Worker::~Worker() {
+    if (mRuns) pthread_detach(mThread);
+}
+
+bool Worker::done() const {
+    pollfd fd = {mTask->done.get(), POLLIN, 0};
+    return poll(&fd, 1, 0) == 1;
+}
+
+int Worker::fd() const {
+    return mTask->done.get();
+}
+
+void Worker::join() {
+    pthread_join(mThread, nullptr);
+    mRuns = false;
+}
+
 Waited waitFor(std::function<void()> work, Clock::time_point deadline, const Progress& progress) {
     const HeldSignals signals; // before the thread, which must not be the one that they reach
-    const auto task = std::make_shared<Task>(
-            Task{std::move(work), unique_fd(eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK))});
-    if (task->done.get() == -1 || signals.fd() == -1) return {Waited::End::notStarted, errno};
-
-    auto argument = std::make_unique<std::shared_ptr<Task>>(task);
-    pthread_t thread;
-    const int error = pthread_create(&thread, nullptr, run, argument.get());
-    if (error != 0) return {Waited::End::notStarted, error};
-    argument.release(); // NOLINT(bugprone-unused-return-value): the thread's from here on
-    const Waited waited = watch(*task, signals, deadline, progress);
-    if (waited.end == Waited::End::done) {
-        pthread_join(thread, nullptr);
-    } else {
-        pthread_detach(thread);
-    }
+    if (signals.fd() == -1) return {Waited::End::notStarted, errno};
+    Worker worker(std::move(work));
+    if (worker.error() != 0) return {Waited::End::notStarted, worker.error()};
+    const Waited waited = watch(worker, signals, deadline, progress);
+    if (waited.end == Waited::End::done) worker.join();
     return waited;
 }
 

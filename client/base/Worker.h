@@ -3,6 +3,8 @@
 
 #pragma once
 
+#include <pthread.h>
+
 #include <chrono>
 #include <functional>
 #include <memory>
@@ -23,6 +25,33 @@ using Clock = std::chrono::steady_clock;
 
 /** A deadline that never passes. */
 constexpr Clock::time_point kNever = Clock::time_point::max();
+
+/** Work on a thread of its own, which is left behind unless it is joined. */
+class Worker {
+  public:
+    explicit Worker(std::function<void()> work);
+    ~Worker();
+    Worker(const Worker&) = delete;
+    Worker& operator=(const Worker&) = delete;
+
+    /** 0, or the errno that tells why there is no thread: the work has not begun. */
+    int error() const { return mError; }
+    bool done() const;
+    /** Readable when the work is done. */
+    int fd() const;
+    /** Waits for the end of the thread. */
+    void join();
+
+  private:
+    struct Task;
+
+    static void* run(void* task);
+
+    std::shared_ptr<Task> mTask;
+    pthread_t mThread{};
+    int mError = 0;
+    bool mRuns = false;
+};
 
 /** What happens during a wait, on the caller's thread. */
 struct Progress {

@@ -99,7 +99,7 @@ Check checkShell(const std::string& root) {
 }
 
 Check missingTool(const std::string& name, const std::string& tool) {
-    return problem(name, tool + " is not there: calls that use it answer -1 or failure",
+    return problem(name, tool + " is not there: calls that use it answer -1, failure or no count",
                    "install it in /vendor/bin with mode 755" + std::string(kExecuteDenied));
 }
 

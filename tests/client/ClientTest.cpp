@@ -22,6 +22,7 @@ using ::android::sp;
 using ::testing::AllOf;
 using ::testing::ElementsAre;
 using ::testing::HasSubstr;
+using ::testing::Not;
 using ::testing::StartsWith;
 using namespace std::chrono_literals;
 using Words = std::vector<std::string>;
@@ -77,6 +78,36 @@ TEST_F(ClientTest, PrintsTheFlag) {
     mService->flag = false;
     EXPECT_EQ(run({"isMimoSupport"}), 0);
     EXPECT_EQ(out(), "true\nfalse\n");
+}
+
+TEST_F(ClientTest, AStartThatFailedSaysWhatMayBeOnAndWhatEndsIt) {
+    mService->number = -1;
+    EXPECT_EQ(run({"RunTxStStart", "36", "20", "1"}), 1);
+    EXPECT_THAT(err(), IsOneLineWith("; the tone may be on, what ends it is: bex-wifi-client stop "
+                                     "36\n"));
+}
+
+TEST_F(ClientTest, WhatEndsAStartIsACommandLineToCopyWhateverTheChannel) {
+    mService->number = -1;
+    EXPECT_EQ(run({"snifferStart", "6; reboot", "20"}), 1);
+    EXPECT_THAT(err(), IsOneLineWith("; monitor mode may be on, what ends it is: bex-wifi-client "
+                                     "stop\n"));
+}
+
+TEST_F(ClientTest, WhatStartsNothingLeavesNothingOn) {
+    mService->number = -1;
+    EXPECT_EQ(run({"RunTxStop", "6"}), 1);
+    mService = nullptr;
+    EXPECT_EQ(run({"RunTxBGStart", "6", "54", "15", "1"}), 3);
+    EXPECT_THAT(err(), Not(HasSubstr("may be on")));
+}
+
+TEST_F(ClientTest, StopWithoutAServiceDoesNotSayThatTheRadioIsOff) {
+    mService = nullptr;
+    EXPECT_EQ(run({"stop", "6"}), 3);
+    EXPECT_EQ(out(), "the radio may be on\n");
+    EXPECT_THAT(err(), IsOneLineWith("; the radio may be on, try again: bex-wifi-client stop 6\n"));
+    EXPECT_EQ(run({"stop", "6", "7"}), 2);
 }
 
 TEST_F(ClientTest, PrintsTheTextByteForByte) {

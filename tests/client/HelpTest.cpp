@@ -20,8 +20,8 @@ TEST(HelpTest, NamesEveryMethodOptionAndExitCode) {
         EXPECT_THAT(help, HasSubstr("\n  " + std::string(command.name) + " "));
         EXPECT_THAT(help, HasSubstr(command.summary));
     }
-    for (const char* option :
-         {"--json", "--timeout SECONDS", "--help", "list [--json]", "doctor [--json]", "  -- "}) {
+    for (const char* option : {"--json", "--timeout SECONDS", "--help", "list [--json]",
+                               "doctor [--json]", "stop [--json] [CHANNEL]", "  -- "}) {
         EXPECT_THAT(help, HasSubstr(option));
     }
     for (int exitCode = 0; exitCode <= 6; ++exitCode) {

@@ -1,0 +1,66 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#pragma once
+
+#include <string>
+
+#include "client/Call.h"
+#include "client/base/Json.h"
+
+// What the user is told of a finished call.
+
+namespace vendor::korvan::bex::wifi::client {
+
+/**
+ * What the client ends with. Its own codes are below 126, so that no shell mistakes one for its
+ * own.
+ */
+enum ExitCode {
+    kSuccess = 0,
+    /** The service answered -1 or "failure", the doctor found a problem, the radio may be on. */
+    kFailed = 1,
+    kWrongUsage = 2,
+    /** The service cannot be found. */
+    kNoService = 3,
+    /** The transport failed in the call, or there was no thread for it. */
+    kTransportFailed = 4,
+    /** The deadline passed. */
+    kTooLate = 5,
+    /** The result could not be written. */
+    kNotWritten = 6,
+    /** And the number of the signal that ended the wait for an answer, as shells have it. */
+    kSignalled = 128,
+};
+
+struct Report {
+    int exitCode = kSuccess;
+    /** Why it is not kSuccess, on one line; empty when it is. */
+    std::string error;
+};
+
+/** Of a call that has no answer. `doing` is what it was, such as a method's name. */
+Report judgeUnanswered(const std::string& doing, const Outcome& outcome);
+
+/** Of a call of a method. */
+Report judge(const Request& request, const Outcome& outcome);
+
+/** Whether the call may have started something that goes on. */
+bool mayHaveStarted(const Request& request, const Outcome& outcome);
+
+/** "stop" with the channel where it is a plain number, as a command line to copy. */
+std::string stopCommandLine(const std::string& channel);
+
+/** The object that --json prints of a call, with a newline. */
+std::string jsonReport(const Request& request, const Outcome& outcome, const Report& report);
+
+/** What the JSON objects of all calls begin with: whose they are, and when and how they ran. */
+JsonObject jsonHead(const std::string& method, const JsonObject& arguments, const Report& report);
+
+/** The members that tell of the call's course. */
+void addCourse(const Outcome& outcome, JsonObject* object);
+
+/** The object with the members that end every report, and a newline. */
+std::string withEnding(JsonObject object, const Report& report);
+
+} // namespace vendor::korvan::bex::wifi::client

@@ -1,0 +1,179 @@
+// Copyright 2026 The BEX Wi-Fi Authors
+// SPDX-License-Identifier: Apache-2.0
+
+#include "client/Stop.h"
+
+#include <algorithm>
+#include <memory>
+#include <mutex>
+#include <thread>
+
+namespace vendor::korvan::bex::wifi::client {
+namespace {
+
+using ::android::sp;
+
+constexpr const char* kMethods[] = {"RunTxStop", "RunTxStStop", "RunRxStop", "snifferStop"};
+constexpr int kPasses = 3;
+constexpr std::chrono::microseconds kBetweenQuestions(200);
+constexpr std::chrono::milliseconds kBetweenLooks(100);
+
+// What the answer 0 tells, by the lines that must have succeeded for it:
+//
+//   broadcom      snifferStop   "ifconfig wlan0 down" ends the firmware, and every test with it.
+//                               RunTxStop and RunTxStStop do so too, and fail when nothing runs
+//   the others    RunTxStStop   "rmmod wlan" ends the driver, and every test with it; what is
+//   loaded
+//                               afterwards starts in normal mode. On wcn RunTxStop only ends the
+//                               transmission
+//                 snifferStop   "echo 0" ends monitor mode
+//
+// RunRxStop proves nothing anywhere: its answer is a count, also after failed commands.
+struct Proof {
+    const char* family;
+    std::vector<std::string> methods;
+};
+const std::vector<Proof> kProofs = {{"broadcom", {"snifferStop"}}};
+const std::vector<std::string> kProofOfOthers = {"RunTxStStop", "snifferStop"};
+
+// A question that is answered in less than this part of the time of the call beside it has not
+// waited for that call's end.
+constexpr int kPromptly = 4;
+
+/** What the worker tells; the caller may give up at any time. */
+struct Shared {
+    std::mutex lock;
+    Stopped stopped;
+};
+
+bool proves(const std::vector<StopCall>& calls, const std::vector<std::string>& methods) {
+    return std::all_of(methods.begin(), methods.end(), [&calls](const std::string& method) {
+        return std::any_of(calls.begin(), calls.end(), [&method](const StopCall& call) {
+            return call.command->name == method && call.answer.text == "0";
+        });
+    });
+}
+
+class Work {
+  public:
+    Work(std::string channel, const std::string& family, std::shared_ptr<Shared> shared)
+          : mChannel(std::move(channel)), mProof(proofOf(family)), mShared(std::move(shared)) {}
+
+    void run(const FindService& find) {
+        mService = find();
+        if (mService == nullptr) return end(Ending::notFound);
+        set([](Stopped* stopped) { stopped->outcome.stage = Stage::call; });
+        while (!makeCalls() && mError.empty()) {
+            while (!isAlone() && mError.empty()) std::this_thread::sleep_for(kBetweenLooks);
+        }
+        set([](Stopped* stopped) { stopped->alone = true; });
+        for (int pass = 0; pass < kPasses && mError.empty(); ++pass) {
+            makeCalls();
+            if (judge()) break;
+        }
+        if (!mError.empty()) return fail();
+        end(Ending::answered);
+    }
+
+  private:
+    template <typename Change>
+    void set(Change change) {
+        const std::lock_guard<std::mutex> guard(mShared->lock);
+        change(&mShared->stopped);
+    }
+    void end(Ending how) {
+        set([how](Stopped* stopped) { stopped->outcome.ending = how; });
+    }
+    void fail() {
+        set([this](Stopped* stopped) {
+            stopped->outcome.ending = Ending::transportFailed;
+            stopped->outcome.answer.transportError = mError;
+        });
+    }
+
+    /** Asks the service until the work is done: the time that the slowest answer took. */
+    Clock::duration slowestAnswerDuring(std::function<void()> work) {
+        Clock::duration slowest{};
+        Worker worker(std::move(work));
+        if (worker.error() != 0) mError = "no second thread can be started";
+        while (mError.empty() && !worker.done()) {
+            const Clock::time_point asked = Clock::now();
+            const auto answer = mService->isMimoSupport();
+            if (!answer.isOk()) mError = answer.description();
+            slowest = std::max(slowest, Clock::now() - asked);
+            std::this_thread::sleep_for(kBetweenQuestions);
+        }
+        if (mError.empty()) worker.join();
+        return slowest;
+    }
+
+    /** Whether the service seems to be in no other call. Changes nothing. */
+    bool isAlone() {
+        const Clock::time_point begin = Clock::now();
+        const Clock::duration slowest =
+                slowestAnswerDuring([service = mService] { service->getWlanMode().isOk(); });
+        return slowest < (Clock::now() - begin) / kPromptly;
+    }
+
+    /** Makes all calls once; tells whether the service was in no other call meanwhile. */
+    bool makeCalls() {
+        set([](Stopped* stopped) { stopped->calls.clear(); });
+        const auto longest = std::make_shared<Clock::duration>();
+        const Clock::duration slowest = slowestAnswerDuring(
+                [shared = mShared, service = mService, channel = mChannel, longest] {
+                    for (const char* method : kMethods) {
+                        const Clock::time_point begin = Clock::now();
+                        const Command& command = *findCommand(method);
+                        const std::vector<Value> values(command.arguments.size(), {channel});
+                        const Answer answer = command.call(*service, values);
+                        *longest = std::max(*longest, Clock::now() - begin);
+                        const std::lock_guard<std::mutex> guard(shared->lock);
+                        shared->stopped.calls.push_back({&command, answer});
+                    }
+                });
+        if (!mError.empty()) return false;
+        for (const StopCall& call : mShared->stopped.calls) {
+            if (!call.answer.delivered) mError = call.answer.transportError;
+        }
+        return slowest < *longest / kPromptly;
+    }
+
+    /** Whether the calls that were made last prove that the radio is off. */
+    bool judge() {
+        bool off = false;
+        set([&](Stopped* stopped) { off = stopped->off = proves(stopped->calls, mProof); });
+        return off;
+    }
+
+    const std::string mChannel;
+    const std::vector<std::string> mProof;
+    const std::shared_ptr<Shared> mShared;
+    sp<IWifiService> mService;
+    /** Why the service cannot be asked on; empty as long as it can. */
+    std::string mError;
+};
+
+} // namespace
+
+std::vector<std::string> proofOf(const std::string& family) {
+    for (const Proof& proof : kProofs) {
+        if (family == proof.family) return proof.methods;
+    }
+    return kProofOfOthers;
+}
+
+Stopped stopRadio(const std::string& channel, const std::string& family, const FindService& find,
+                  std::chrono::nanoseconds timeout, const Progress& progress) {
+    const Clock::time_point start = Clock::now();
+    const auto shared = std::make_shared<Shared>();
+    const auto work = std::make_shared<Work>(channel, family, shared);
+    const Waited waited = waitFor([work, find] { work->run(find); }, start + timeout, progress);
+    const std::lock_guard<std::mutex> guard(shared->lock);
+    Stopped stopped = shared->stopped;
+    applyWait(waited, &stopped.outcome);
+    if (stopped.outcome.ending == Ending::answered) stopped.outcome.stage = Stage::done;
+    stopped.outcome.duration = Clock::now() - start;
+    return stopped;
+}
+
+} // namespace vendor::korvan::bex::wifi::client
