@@ -52,6 +52,8 @@ def create(chip, folder, installs):
         kind = process.choose(unfinished)
         with open(f"{unfinished}/sandbox", "w", encoding="ascii") as record:
             record.write(kind + "\n")
+        with open(f"{unfinished}/chip", "w", encoding="utf-8") as record:
+            record.write(os.path.basename(chip) + "\n")
         try:
             os.rename(unfinished, folder)
         except OSError:  # another create was faster

@@ -16,7 +16,8 @@ from launcher.errors import PhoneError
 
 USAGE = """\
 usage: phone create CHIP DIR [--install SRC=DEST]...   build a phone in the new folder DIR
-       phone up DIR                                    boot it and start its service
+       phone up DIR [--adb [PORT]]                     boot it and start its service; --adb prints
+             the serial number of the phone on adb
        phone down DIR                                  end everything that runs in it
        phone restart-service DIR                       kill the service and start it again
        phone run DIR COMMAND [ARG...]                  run a command in it, up or not
@@ -77,7 +78,7 @@ def open_closed_streams():
 
 
 def phone_folder(arguments):
-    """The single argument of up, down and restart-service: an existing phone's folder."""
+    """The single argument of down and restart-service: an existing phone's folder."""
     if len(arguments) != 1:
         raise UsageError
     return checked_folder(arguments[0])
@@ -114,14 +115,43 @@ def create(arguments):
 def up(arguments):
     from launcher import power
 
+    if "--adb" in arguments[1:]:
+        return up_with_adb(arguments)
     power.up(phone_folder(arguments))
     return 0
 
 
-def down(arguments):
+def up_with_adb(arguments):
+    from adb import control
     from launcher import power
 
-    power.down(phone_folder(arguments))
+    folder, option, *port = arguments
+    if option != "--adb" or len(port) > 1:
+        raise UsageError
+    if port and not (port[0].isascii() and port[0].isdigit() and int(port[0]) < 65536):
+        raise PhoneError(f"'{port[0]}' is no port: a number below 65536")
+    folder = checked_folder(folder)
+    if control.serial(folder):
+        print(f"phone: {folder} is on adb already", file=sys.stderr)
+        power.up(folder)
+    else:
+        control.start(folder, control.listen(int("".join(port) or 0)))
+        try:
+            power.up(folder)
+        except BaseException:
+            control.end(folder)
+            raise
+    print(control.serial(folder))
+    return 0
+
+
+def down(arguments):
+    from adb import control
+    from launcher import power
+
+    folder = phone_folder(arguments)
+    control.end(folder)
+    power.down(folder)
     return 0
 
 

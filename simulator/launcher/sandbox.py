@@ -30,7 +30,8 @@ ENVIRONMENT = {
 KINDS = ("bwrap", "proot")
 CAP_SETPCAP = 8  # from <linux/capability.h>
 LONGEST_SOCKET_FOLDER = 36  # leaves 71 bytes for /hidl/ and the name of a socket
-DEVICES = {"null": (1, 3), "zero": (1, 5), "full": (1, 7), "random": (1, 8), "urandom": (1, 9)}
+DEVICES = {"null": (1, 3), "zero": (1, 5), "full": (1, 7), "random": (1, 8), "urandom": (1, 9),
+           "tty": (5, 0)}
 
 
 def find_program(name):

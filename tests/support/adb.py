@@ -1,0 +1,104 @@
+# Copyright 2026 The BEX Wi-Fi Authors
+# SPDX-License-Identifier: Apache-2.0
+"""Debian's adb with a server of its own, and phones that answer it.
+
+The server has a socket in a temporary folder in place of a port, its keys lie there too, and it looks
+for no emulators: the user's server and phones are left alone.
+"""
+
+import contextlib
+import os
+import pathlib
+import subprocess
+import tempfile
+
+import pytest
+
+from support.phone import PHONE, Phone
+
+TIMEOUT = 60
+
+
+class Adb:
+    """The adb program, with its server."""
+
+    def __init__(self, home):
+        self.environment = {
+            "PATH": os.environ["PATH"], "HOME": home, "ADB_VENDOR_KEYS": home,
+            "ADB_SERVER_SOCKET": f"localfilesystem:{home}/socket",
+            "ADB_LOCAL_TRANSPORT_MAX_PORT": "5553", "TERM": "xterm"}
+
+    def __call__(self, *arguments, **options):
+        """The finished process."""
+        stdin = {} if "input" in options else {"stdin": subprocess.DEVNULL}
+        return subprocess.run(["adb", *arguments], env=self.environment, check=False,
+                              timeout=TIMEOUT, **{"capture_output": True, **stdin, **options})
+
+    def start(self, *arguments, **options):
+        return subprocess.Popen(["adb", *arguments], env=self.environment, **options)
+
+
+class AdbPhone(Phone):
+    """A phone on adb."""
+
+    def __init__(self, adb, *arguments):
+        super().__init__(*arguments)
+        self.adb = adb
+        self.serial = None
+
+    def up(self):
+        up = subprocess.run([PHONE, "up", self.folder, "--adb"], check=True, timeout=TIMEOUT,
+                            stdout=subprocess.PIPE, text=True)
+        self.serial = up.stdout.strip()
+        self.connect()
+
+    def connect(self):
+        connected = self.adb("connect", self.serial)
+        assert connected.stdout == f"connected to {self.serial}\n".encode(), connected
+
+    def do(self, *arguments, **options):
+        """An adb command on this phone."""
+        return self.adb("-s", self.serial, *arguments, **options)
+
+    def shell(self, *arguments, **options):
+        """What adb shell does: its exit code, stdout and stderr."""
+        done = self.do("shell", *arguments, **options)
+        return done.returncode, done.stdout, done.stderr
+
+
+@pytest.fixture(scope="session", name="adb")
+def adb_fixture():
+    with tempfile.TemporaryDirectory(prefix="bex-adb-") as home:
+        adb = Adb(home)
+        yield adb
+        adb("kill-server")
+
+
+@contextlib.contextmanager
+def made_phone(adb, chip):
+    """A phone that is off, and will be."""
+    with tempfile.TemporaryDirectory(prefix="bex-") as folder:
+        phone = AdbPhone(adb, chip, pathlib.Path(folder, "0"))
+        try:
+            yield phone
+        finally:
+            phone.down()
+
+
+@pytest.fixture(scope="session", name="phone")
+def phone_fixture(adb):
+    """A phone on adb that the tests share."""
+    with made_phone(adb, "broadcom") as phone:
+        phone.up()
+        yield phone
+
+
+def processes_of(phone):
+    """The `phone run` processes that adb's clients have running, by number."""
+    found = []
+    for entry in pathlib.Path("/proc").glob("[0-9]*/cmdline"):
+        with contextlib.suppress(OSError):
+            words = entry.read_bytes().split(b"\0")
+            if b"run" in words and os.fsencode(phone.folder) in words:
+                found.append(int(entry.parent.name))
+    return found
