@@ -49,19 +49,20 @@ int serve(int listener) {
 } // namespace
 
 int main(int argc, char** argv) {
-    sockaddr_un address{AF_UNIX, "/dev/socket/hidl/standin@1.0::IStandIn.default"};
+    constexpr char kPath[] = "/dev/socket/hidl/standin@1.0::IStandIn.default";
     const int fd = socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0);
     if (argc == 1) {
-        // Bound under another name until it listens: what is seen can be connected to.
-        const std::string path = address.sun_path;
-        strcat(address.sun_path, ".new");
-        if (bind(fd, reinterpret_cast<sockaddr*>(&address), sizeof address) != 0 ||
-            listen(fd, 5) != 0 || rename(address.sun_path, path.c_str()) != 0) {
+        // Bound under a hidden name until it listens: what the launcher sees can be connected to.
+        sockaddr_un hidden{AF_UNIX, "/dev/socket/hidl/.standin"};
+        if (bind(fd, reinterpret_cast<sockaddr*>(&hidden), sizeof hidden) != 0 ||
+            listen(fd, 5) != 0 || rename(hidden.sun_path, kPath) != 0) {
             perror("standin");
             return 1;
         }
         return serve(fd);
     }
+    sockaddr_un address{AF_UNIX, {}};
+    memcpy(address.sun_path, kPath, sizeof kPath);
     if (connect(fd, reinterpret_cast<sockaddr*>(&address), sizeof address) != 0) {
         perror("standin");
         return 1;
