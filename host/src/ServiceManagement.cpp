@@ -60,8 +60,11 @@ std::vector<std::string> getAllHalInstanceNames(const std::string& descriptor) {
 namespace details {
 namespace {
 
-/** What stands behind the name now. */
-sp<IBase> lookUp(const std::string& path) {
+/**
+ * What stands behind the name now. A remote object is asked for its interfaces, so this waits for a
+ * thread of a busy service, and for one that has registered and does not serve yet.
+ */
+sp<IBase> lookUp(const std::string& path, const std::string& descriptor) {
     host::FileIdentity identity;
     if (host::FileIdentity::of(path, &identity) != OK) return nullptr;
     // Asking its own socket would wait for a thread that may be the caller's.
@@ -70,19 +73,22 @@ sp<IBase> lookUp(const std::string& path) {
     }
     std::unique_ptr<host::Session> session = host::Session::open(path);
     if (session == nullptr) return nullptr;
-    return new BpHwBase(new host::RemoteBinder(std::move(session)));
+    sp<IBase> remote = new BpHwBase(new host::RemoteBinder(std::move(session)));
+    const Return<bool> fits = canCastInterface(remote.get(), descriptor.c_str(), true);
+    return fits.isOk() && fits ? remote : nullptr;
 }
 
-sp<IBase> waitFor(const std::string& path, const char* descriptor, const char* instance) {
+sp<IBase> waitFor(const std::string& path, const std::string& descriptor,
+                  const std::string& instance) {
     using std::chrono::steady_clock;
     auto nextLine = steady_clock::now() + std::chrono::seconds(1);
     for (;;) {
         host::RegistrationWatch watch;
-        if (sp<IBase> found = lookUp(path); found != nullptr) return found;
+        if (sp<IBase> found = lookUp(path, descriptor); found != nullptr) return found;
         const auto left = nextLine - steady_clock::now();
         if (!watch.wait(std::chrono::ceil<std::chrono::milliseconds>(left)) &&
             steady_clock::now() >= nextLine) {
-            ALOGW("Waited one second for %s/%s", descriptor, instance);
+            ALOGW("Waited one second for %s/%s", descriptor.c_str(), instance.c_str());
             nextLine += std::chrono::seconds(1);
         }
     }
@@ -110,14 +116,14 @@ sp<IBase> getRawServiceInternal(const std::string& descriptor, const std::string
                                 bool retry, bool getStub) {
     if (getStub) return nullptr;
     const std::string path = host::socketPath(descriptor, instance);
-    sp<IBase> found = lookUp(path);
+    sp<IBase> found = lookUp(path, descriptor);
     if (found != nullptr || !retry) return found;
     if (!host::isDeclaredInManifest(descriptor, instance)) {
         ALOGW("%s/%s is not registered, and the VINTF manifest does not declare it",
               descriptor.c_str(), instance.c_str());
         return nullptr;
     }
-    return waitFor(path, descriptor.c_str(), instance.c_str());
+    return waitFor(path, descriptor, instance);
 }
 
 } // namespace details

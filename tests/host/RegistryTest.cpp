@@ -7,6 +7,7 @@
 #include <signal.h>
 #include <sys/stat.h>
 #include <unistd.h>
+#include <vendor/korvan/bex/wifi/1.0/BpHwWifiService.h>
 
 #include <atomic>
 #include <chrono>
@@ -15,6 +16,9 @@
 #include <thread>
 
 #include "host/src/RegistrationWatch.h"
+#include "host/src/RemoteBinder.h"
+#include "host/src/Session.h"
+#include "host/src/SocketFile.h"
 #include "tests/host/HostTest.h"
 #include "tests/host/ScriptedService.h"
 
@@ -23,6 +27,8 @@ namespace {
 
 using ::android::BAD_VALUE;
 using ::android::OK;
+using ::android::hardware::host::RemoteBinder;
+using ::android::hardware::host::Session;
 
 constexpr const char* kManifest = R"(<manifest version="1.0" type="device">
     <hal format="hidl">
@@ -79,7 +85,11 @@ TEST_F(RegistryTest, OldProxyKeepsItsObjectUnaccepted) {
                           "default", "ready", "join"});
     ASSERT_EQ(server.report(), "0");
     ASSERT_EQ(server.report(), "ready");
-    sp<IWifiService> old = IWifiService::tryGetService();
+    // As a search does, but without asking the server, which does not serve yet.
+    auto session =
+            Session::open(android::hardware::host::socketPath(IWifiService::descriptor, "default"));
+    ASSERT_NE(session, nullptr);
+    sp<IWifiService> old = new V1_0::BpHwWifiService(new RemoteBinder(std::move(session)));
     server.openGate();
     ASSERT_EQ(server.report(), "0");
     EXPECT_EQ(tagOf(old), 5);

@@ -108,6 +108,21 @@ TEST_F(ServerTest, ThirdCallWaitsForAThread) {
     expectAnswer(*third);
 }
 
+TEST_F(ServerTest, ASearchWaitsForAThread) {
+    auto first = std::async(std::launch::async, [&] { return call(service, "wait"); });
+    auto second = std::async(std::launch::async, [&] { return call(service, "wait"); });
+    ASSERT_EQ(server->report(), "entered");
+    ASSERT_EQ(server->report(), "entered");
+
+    auto search = std::async(std::launch::async, [] { return IWifiService::tryGetService(); });
+    EXPECT_EQ(search.wait_for(std::chrono::milliseconds(200)), std::future_status::timeout);
+    server->openGate();
+    EXPECT_NE(search.get(), nullptr);
+    server->openGate();
+    EXPECT_EQ(first.get(), "done");
+    EXPECT_EQ(second.get(), "done");
+}
+
 // Calls that all wait at once, from more clients than threads.
 TEST_F(ServerTest, ManyClientsAreAllServed) {
     std::vector<std::thread> clients;
