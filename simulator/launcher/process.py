@@ -17,8 +17,9 @@ import os
 import select
 import signal
 
+from launcher import landlock
 from launcher.errors import PhoneError
-from launcher.sandbox import ENVIRONMENT, KINDS, command_line
+from launcher.sandbox import ENVIRONMENT, KINDS, command_line, writable
 
 PR_SET_PDEATHSIG, PR_SET_CHILD_SUBREAPER = 1, 36  # from <linux/prctl.h>
 QUIT_SECONDS = 5
@@ -83,6 +84,7 @@ class Sandbox:
 
     def __init__(self, kind, folder, command, streams=()):
         self.kind = kind
+        self.folder = folder
         self.line = command_line(kind, folder) + [
             "/system/bin/sh", "-c", ENTRY[kind], "sh", *command]
         self.streams = streams
@@ -100,7 +102,7 @@ class Sandbox:
             signal.signal(number, lambda number, _frame, handler=handler: handler(self, number))
         self.pid = os.fork()
         if self.pid == 0:
-            _become(self.line, self.streams)
+            self._become()
         unblock_signals()
         self._wait(stop)
         block_signals()  # the next line frees the number
@@ -111,6 +113,25 @@ class Sandbox:
                 if name.startswith(f"prooted-{self.pid}-"):
                     os.remove(f"/tmp/{name}")
         return 128 + self.ended_by if self.ended_by else _code(status)
+
+    def _become(self):
+        """In the forked child: turns into the sandbox. Nothing of the caller is inherited but the
+        three standard streams."""
+        try:
+            os.setsid()
+            for number in signal.valid_signals() - {signal.SIGKILL, signal.SIGSTOP}:
+                signal.signal(number, signal.SIG_DFL)
+            unblock_signals()
+            for number, stream in enumerate(self.streams):
+                os.dup2(stream, number)
+            if self.kind == "proot":
+                landlock.confine(writable(self.folder))
+            os.closerange(3, os.sysconf("SC_OPEN_MAX"))
+            os.execve(self.line[0], self.line, ENVIRONMENT)
+        except OSError as error:
+            os.write(2, f"phone: {self.line[0]}: {error.strerror}\n".encode())
+        finally:
+            os._exit(125)
 
     def _wait(self, stop):
         """Returns when the sandbox has ended, which is left to be reaped."""
@@ -158,24 +179,6 @@ class Sandbox:
         signal.SIGTSTP: _suspend,
         signal.SIGCONT: _signal,
     }
-
-
-def _become(line, streams):
-    """In the forked child: turns into the sandbox. Nothing of the caller is inherited but the
-    three standard streams."""
-    try:
-        os.setsid()
-        for number in signal.valid_signals() - {signal.SIGKILL, signal.SIGSTOP}:
-            signal.signal(number, signal.SIG_DFL)
-        unblock_signals()
-        for number, stream in enumerate(streams):
-            os.dup2(stream, number)
-        os.closerange(3, os.sysconf("SC_OPEN_MAX"))
-        os.execve(line[0], line, ENVIRONMENT)
-    except OSError as error:
-        os.write(2, f"phone: {line[0]}: {error.strerror}\n".encode())
-    finally:
-        os._exit(125)
 
 
 def block_signals():

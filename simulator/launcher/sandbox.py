@@ -62,6 +62,13 @@ def command_line(kind, folder):
     return (_bwrap if kind == "bwrap" else _proot)(folder, os.path.join(folder, "root"))
 
 
+def writable(folder):
+    """The files of this machine that proot and what runs in it may change: proot keeps files of its
+    own in /tmp, and the sockets may be there."""
+    root = os.path.join(folder, "root")
+    return [root, "/tmp", *_borrowed_devices(root)]
+
+
 def socket_folder(kind, folder):
     """Where the phone's /dev/socket lies on this machine: a folder, and the path below it, on which
     no link is to be followed.

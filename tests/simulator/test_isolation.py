@@ -6,6 +6,7 @@ What is tried asks for the state that the machine is in already, so that a leak 
 harm: an interface that is up is asked to be up.
 """
 
+import ctypes
 import os
 import pathlib
 import platform
@@ -14,8 +15,10 @@ import subprocess
 
 import pytest
 
-from conftest import ENDLESS, Launcher, Phone, wait_until
+from conftest import ENDLESS, SOURCE, Launcher, Phone, wait_until
 
+# The version of Landlock that the kernel has.
+LANDLOCK = ctypes.CDLL(None).syscall(444, None, 0, 1)
 IFF_UP = 1  # from <linux/if.h>
 INTERFACES = pathlib.Path("/sys/class/net")
 
@@ -151,6 +154,38 @@ def test_no_process_of_the_machine_can_be_seen(any_new_phone):
     assert any_new_phone.output("echo /proc/[0-9]*").split() in (["/proc/1", "/proc/2"],
                                                              ["/proc/1", "/proc/2", "/proc/3"])
     assert any_new_phone.shell(f"kill -0 {os.getpid()}").returncode != 0
+
+
+def test_no_process_of_the_machine_can_be_signalled(any_new_phone):
+    user = any_new_phone.root.stat().st_uid
+    with subprocess.Popen(["sleep", "1000"], user=user if os.geteuid() == 0 else None) as stranger:
+        try:
+            result = any_new_phone.shell(f"kill -0 {stranger.pid}; echo $?; kill -0 $$; echo $?")
+            inside = any_new_phone.launcher.kind == "bwrap" or LANDLOCK >= 6
+            assert result.stdout == ("1\n0\n" if inside else "0\n0\n")
+        finally:
+            stranger.kill()
+
+
+@pytest.mark.skipif(LANDLOCK < 3, reason="this kernel does not limit files")
+def test_what_gets_past_proot_changes_no_file_outside(place):
+    """What proot is given up to by the launcher, before it starts."""
+    (place / "inside").mkdir()
+    (place / "outside").mkdir()
+    (place / "outside/file").write_text("as it was")
+    attempts = ["open('{}/new', 'w')", "open('{}/file', 'a')", "os.truncate('{}/file', 0)",
+                "os.remove('{}/file')", "os.mkdir('{}/folder')", "os.symlink('x', '{}/link')",
+                "os.rename('{}/file', 'inside/moved')"]
+    script = "import os, sys; sys.path.insert(0, sys.argv[1]); from launcher import landlock\n" \
+             "landlock.confine(['inside'])\n" \
+             "def attempt(line):\n try: eval(line)\n except PermissionError: print(line)\n"
+    script += "".join(f'attempt("{line.format("outside")}")\n' for line in attempts)
+    script += "open('inside/file', 'w').close(); os.mkdir('inside/folder'); " \
+              "os.rename('inside/file', 'inside/folder/file')"
+    result = subprocess.run(["/usr/bin/python3", "-B", "-c", script, SOURCE / "simulator"], cwd=place,
+                            capture_output=True, text=True, check=True)
+    assert result.stdout.splitlines() == [line.format("outside") for line in attempts]
+    assert (place / "outside/file").read_text() == "as it was"
 
 
 @pytest.mark.skipif(os.geteuid() != 0, reason="root's capabilities")
