@@ -16,6 +16,8 @@
 #include <functional>
 #include <string>
 
+#include "chips/ChipFamily.h"
+#include "chips/ModuleFiles.h"
 #include "recorder/RecordedShell.h"
 #include "service/WifiService.h"
 #include "shell/Command.h"
@@ -23,6 +25,7 @@
 namespace {
 
 using namespace vendor::korvan::bex::wifi::V1_0::implementation;
+using namespace vendor::korvan::bex::wifi;
 using recorder::RecordedShell;
 
 // Between count() and its end: callgrind's switch only turns over, so it must stand the right way.
@@ -87,23 +90,6 @@ int __wrap___android_log_print(int, const char*, const char*, ...) {
 
 namespace {
 
-struct Phone {
-    const char* name;
-    const char* vendor;
-    const char* chip;
-    std::vector<std::string> modules;
-};
-
-const Phone kPhones[] = {
-        {"broadcom", "broadcom", "", {}},
-        {"wcn", "qcom", "WCN3990", {"wlan.ko"}},
-        {"qca", "qcom", "QCA6174", {"qca_cld3_wlan.ko"}},
-        {"qca639x", "qcom", "qca639x", {"qca_cld3_qca6390.ko", "qca_cld3_spectral.ko"}},
-        {"wcn685x", "qcom", "wcn685x", {"qca_cld3_qca6390.ko", "qca_cld3_wcn6855.ko"}},
-        {"wcn6750", "qcom", "wcn6750", {"qca_cld3_wcn6750.ko"}},
-        {"wcn39xx", "qcom", "wcn3950", {"qca_cld3/qca_cld3_wlan.ko"}},
-};
-
 struct Operation {
     const char* name;
     std::function<void(WifiService&)> call;
@@ -147,44 +133,46 @@ std::string listing(int kilobytes) {
     return text + "goodPackets = 48 badPackets 3\n";
 }
 
-void countLines(const Phone& phone, const RecordedShell& shell, WifiService& service) {
+void countLines(const ChipFamily& family, const RecordedShell& shell, WifiService& service) {
     for (const Operation& operation : kOperations) {
         const size_t before = shell.lines().size();
         operation.call(service);
         const size_t lines = shell.lines().size() - before;
         if (lines == 0) continue;
-        count(std::string("lines ") + phone.name + " " + operation.name + " " +
+        count(std::string("lines ") + family.name + " " + operation.name + " " +
                       std::to_string(lines),
               [&] { operation.call(service); });
     }
 }
 
-void countPackets(const Phone& phone, RecordedShell& shell, WifiService& service) {
+void countPackets(const ChipFamily& family, RecordedShell& shell, WifiService& service) {
     for (int kilobytes : {256, 1024}) {
         const std::string text = listing(kilobytes);
         for (const char* counter : {"wl counters", "get_rxpktcnt", "myftm"}) {
             shell.answer(counter, {text});
         }
-        count(std::string("packets ") + phone.name + " " + std::to_string(kilobytes),
+        count(std::string("packets ") + family.name + " " + std::to_string(kilobytes),
               [&] { service.RunRxStop(kChannel5, ignore); });
     }
 }
 
-void countPhone(const Phone& phone) {
+void countFamily(const ChipFamily& family) {
     RecordedShell shell;
-    for (const std::string& module : phone.modules) {
-        shell.readable("/vendor/lib/modules/" + module);
+    if (family.modules == DriverModules::oneOfSeveral) {
+        shell.readable(kModuleCandidates[std::size(kModuleCandidates) - 1]);
     }
-    shell.directory("/vendor/lib/modules", phone.modules);
+    if (family.modules == DriverModules::allOfAFolder) {
+        shell.directory(kModuleFolder, {"qca_cld3_a.ko", "qca_cld3_b.ko"});
+    }
     shell.answer("con_mode", {"4\n"});
     shell.answer("counters", {"pktengrxdmcast 48\n"});
     shell.answer("get_rxpktcnt", {"wlan0     get_rxpktcnt:48\n"});
     shell.answer("myftm", {"goodPackets = 48 badPackets 3\n"});
-    android::base::SetProperty("ro.hardware.wlan.vendor", phone.vendor);
-    android::base::SetProperty("ro.hardware.wlan.chip", phone.chip);
+    android::base::SetProperty("ro.hardware.wlan.vendor", family.vendor);
+    android::base::SetProperty("ro.hardware.wlan.chip", family.partOfName);
     const android::sp<WifiService> service = new WifiService();
-    countLines(phone, shell, *service);
-    countPackets(phone, shell, *service);
+    countLines(family, shell, *service);
+    countPackets(family, shell, *service);
 }
 
 /** What the switches for one command cost, which is not the service's. */
@@ -225,7 +213,7 @@ void countReplacing() {
 
 int main() {
     // Callgrind starts with the counting on or off as it is told; it is told off.
-    for (const Phone& phone : kPhones) countPhone(phone);
+    for (const ChipFamily& family : chipFamilies()) countFamily(family);
     countSwitches();
     countOutput();
     android::base::SetProperty("ro.hardware.wlan.vendor", "broadcom");

@@ -38,7 +38,7 @@ std::unique_ptr<VendorTestSuit> makeAndLookAgain() {
 }
 
 // clang-format off
-constexpr std::array<Suite, kSuites> kTable = {{
+constexpr Suite kSuites[] = {
 //   make                               label                       field  insmod  first  axText
     {make<BrcmTestSuit>,                "pktengrxdmcast",           0,     false,  true,  nullptr},
     {makeAndLookAgain<WcnTestSuit>,     "wlan0     get_rxpktcnt:",  0,     false,  false, " "},
@@ -46,7 +46,7 @@ constexpr std::array<Suite, kSuites> kTable = {{
     {make<Qca639xTestSuit>,             nullptr,                    2,     true,   false, nullptr},
     {make<Wcn6750TestSuit>,             nullptr,                    2,     true,   false, nullptr},
     {makeAndLookAgain<Wcn39xxTestSuit>, nullptr,                    1,     false,  false, nullptr},
-}};
+};
 // clang-format on
 
 constexpr const char* kModules[] = {
@@ -90,8 +90,8 @@ const std::array<Operation, 11> kOperations = {{
 }};
 // clang-format on
 
-const Suite& suiteAt(size_t index) {
-    return kTable[index];
+const Suite& readSuite(Input& input) {
+    return input.oneOf(kSuites);
 }
 
 void readModules(Input& input, recorder::RecordedShell& shell) {

@@ -22,7 +22,7 @@ using vendor::korvan::bex::wifi::V1_0::implementation::VendorTestSuit;
 struct Suite {
     /** Makes one that knows its driver, where that is one module file. */
     std::unique_ptr<VendorTestSuit> (*make)();
-    /** What its counter prints in front of the count, which a start gives too. Null: myftm counts,
+    /** What its counter prints before the count, which a start gives too. Null: myftm counts,
      * and a start says how it went. */
     const char* label;
     /** The field of myftm's statistics that is the count. */
@@ -35,13 +35,8 @@ struct Suite {
     const char* axText;
 };
 
-constexpr size_t kSuites = 6;
-const Suite& suiteAt(size_t index);
-
 /** Chooses the suite that the input has. */
-inline const Suite& readSuite(Input& input) {
-    return suiteAt(input.number(kSuites));
-}
+const Suite& readSuite(Input& input);
 
 /** The driver's module files, as one input has them: one that is the driver, and a folder. */
 void readModules(Input& input, recorder::RecordedShell& shell);

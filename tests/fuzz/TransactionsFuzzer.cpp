@@ -13,7 +13,9 @@
 #include <cstring>
 #include <deque>
 #include <string>
+#include <vector>
 
+#include "chips/ChipFamily.h"
 #include "service/WifiService.h"
 #include "tests/fuzz/Check.h"
 #include "tests/fuzz/Input.h"
@@ -32,6 +34,8 @@ using android::hardware::hidl_vec;
 using android::hardware::Parcel;
 using android::hidl::base::V1_0::IBase;
 using recorder::RecordedShell;
+using vendor::korvan::bex::wifi::chipFamilies;
+using vendor::korvan::bex::wifi::ChipFamily;
 using vendor::korvan::bex::wifi::V1_0::BnHwWifiService;
 using vendor::korvan::bex::wifi::V1_0::IWifiService;
 using vendor::korvan::bex::wifi::V1_0::implementation::vendorTestSuit;
@@ -69,11 +73,6 @@ constexpr Method kMethods[] = {
 // The first that is a suite's, and the last.
 constexpr uint32_t kFirstOperation = 6;
 constexpr uint32_t kLastOperation = 16;
-
-constexpr const char* kPhones[][2] = {
-    {"broadcom", "bcm4375"}, {"qcom", "WCN3990"}, {"qcom", "QCA6174"}, {"qcom", "qca639x"},
-    {"qcom", "wcn685x"},     {"qcom", "wcn6750"}, {"qcom", "wcn3990"},
-};
 // clang-format on
 
 bool isBase(const Method& method) {
@@ -308,9 +307,10 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     // The same on every run: some suites keep the first that they find.
     shell.readable("/vendor/lib/modules/wlan.ko");
     shell.directory("/vendor/lib/modules", {"qca_cld3_a.ko", "qca_cld3_b.ko"});
-    const auto& [vendor, chip] = input.oneOf(kPhones);
-    android::base::SetProperty("ro.hardware.wlan.vendor", vendor);
-    android::base::SetProperty("ro.hardware.wlan.chip", chip);
+    const std::vector<ChipFamily>& families = chipFamilies();
+    const ChipFamily& family = families[input.number(families.size())];
+    android::base::SetProperty("ro.hardware.wlan.vendor", family.vendor);
+    android::base::SetProperty("ro.hardware.wlan.chip", family.partOfName);
     const Script script(input);
     script.apply(shell);
 

@@ -7,25 +7,20 @@ import re
 
 import pytest
 
+from support.families import FAMILIES
 from support.phone import CHIPS
 
-# The forms of what a reception answers; what is not told is told of the driver-tool families.
 COUNT = r"\d+"
-STARTED = {"broadcom": COUNT, "wcn": COUNT}
-STOPPED = {"broadcom": COUNT, "wcn": COUNT}
-AX_STARTED = {"wcn": " "}
-# Their 802.11ax start receives nothing, so there is nothing to count.
-AX_STOPPED = {"qca": "Rx: ", "wcn39xx": "Rx: "}
-
-# Of the modules that these phones have, only some fit the chip.
-ILL_FITTING = {"wcn685x"}
 
 
 def session(chip, mimo):
     """Each call with the form of its answer, in an order in which each finds the phone in a state
     that it can work in."""
-    started = STARTED.get(chip, "ok")
-    stopped = STOPPED.get(chip, rf"Rx: {COUNT}")
+    family = FAMILIES[chip]
+    started = COUNT if family.label else "ok"
+    stopped = COUNT if family.label else f"Rx: {COUNT}"
+    ax_started = family.ax_started.decode() or "ok"
+    ax_stopped = "Rx: " if family.ax_is_idle else stopped
     return [
         (["isMimoSupport"], mimo),
         (["getWlanMode"], "0"),
@@ -42,8 +37,8 @@ def session(chip, mimo):
         (["RunRxStop", "6"], stopped),
         (["RunRxNStart", "149", "40", "7", "false", "2"], started),
         (["RunRxStop", "149"], stopped),
-        (["RunRxAxStart", "36", "80", "9", "1"], AX_STARTED.get(chip, "ok")),
-        (["RunRxStop", "36"], AX_STOPPED.get(chip, stopped)),
+        (["RunRxAxStart", "36", "80", "9", "1"], ax_started),
+        (["RunRxStop", "36"], ax_stopped),
         (["RunRxApJoinHoc", "test-ap", "192.168.1.7"], "0"),
         (["snifferStart", "36", "40"], "0"),
         (["isSnifferMode"], "true"),
@@ -69,7 +64,7 @@ def test_every_method(make_phone, chip):
         commands = phone.commands(seen)
         assert [line for line, _ in commands] == phone.explain(*call), call
         failed = [line for line, ok in commands if not ok]
-        assert chip in ILL_FITTING or not failed, call
+        assert FAMILIES[chip].ill_fitting or not failed, call
         assert all("insmod " in line for line in failed), call
     methods = json.loads(phone.client("list", "--json").stdout)["methods"]
     assert {call[0] for call, _ in calls} == {method["name"] for method in methods}

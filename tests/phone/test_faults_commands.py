@@ -18,16 +18,13 @@ import re
 import pytest
 
 from catalogue import CALLS
+from support.families import FAMILIES
 from support.phone import CHIPS
 from support.waiting import wait_for
 from faults import Line, assert_holds, idle_census, stage
 
 
 ALL_FAULTS = os.environ.get("BEX_FAULTS") == "all"
-
-# Those whose insmod may fail, and those that print the counter itself, with the word that is removed.
-SEVERAL_MODULES = {"qca639x", "wcn685x", "wcn6750"}
-COUNTERS = {"broadcom": b"pktengrxdmcast", "wcn": b"wlan0     get_rxpktcnt:"}
 
 # What a command prints; the first is more than one transaction may carry, as a field of statistics, too.
 PRINTED = {
@@ -57,25 +54,28 @@ def mode_answer(method, text):
 
 
 def count_answer(chip, text):
-    if chip in COUNTERS:
-        return text.replace(b"\n", b"").replace(COUNTERS[chip], b"")
+    family = FAMILIES[chip]
+    if family.label:
+        return text.replace(b"\n", b"").replace(family.label, b"")
     found = text.replace(b"\n", b" ").rpartition(b"goodPackets")
     statistics = (found[1] + found[2]).split(b" ") if found[1] else [b""]
-    field = 2 if chip in SEVERAL_MODULES else 1
-    return b"Rx: " + (statistics[field] if field < len(statistics) else b" ".join(statistics))
+    return b"Rx: " + (statistics[family.field] if family.field < len(statistics)
+                      else b" ".join(statistics))
 
 
 def answer(chip, method, lines, failed, outputs):
     """What the caller gets when the `failed` of a method's lines fail and the others print `outputs`."""
-    counts = [line for line in failed if chip not in SEVERAL_MODULES or line.split()[0] != "insmod"]
+    family = FAMILIES[chip]
+    counts = [line for line in failed
+              if not family.several_modules or line.split()[0] != "insmod"]
     if method in ("isSnifferMode", "getWlanMode"):
         return mode_answer(method, outputs.get(lines[0], b""))
     if method == "RunRxStop":
         return count_answer(chip, outputs.get(lines[0], b""))
-    if method in ("RunRxBgStart", "RunRxNStart") and chip in COUNTERS:
+    if method in ("RunRxBgStart", "RunRxNStart") and family.label:
         return count_answer(chip, outputs.get(lines[-1], b""))
-    if (chip, method) == ("wcn", "RunRxAxStart"):
-        return b" "
+    if method == "RunRxAxStart" and family.ax_started:
+        return family.ax_started
     if method in ("RunRxBgStart", "RunRxNStart", "RunRxAxStart"):
         return b"failure" if counts else b"ok"
     return b"-1" if counts else b"0"

@@ -4,8 +4,10 @@
 
 import pytest
 
-# A chip of each family that counts with myftm, and how many blanks stand before its count.
-COUNTING = {"qca": 1, "qca639x": 2, "wcn6750": 2}
+from support.families import FAMILIES
+
+# One chip for each form of the statistics and each tool, and how many blanks stand before its count.
+COUNTING = {chip: FAMILIES[chip].field for chip in ("qca", "qca639x", "wcn6750")}
 
 
 def statistics(*counts, blanks):
