@@ -58,6 +58,8 @@ bool readCommandLine(const std::vector<std::string>& arguments, CommandLine* lin
             line->help = true;
         } else if (*argument == "--json") {
             line->json = true;
+        } else if (*argument == "--require-count") {
+            line->requireCount = true;
         } else if (StartsWith(*argument, kTimeoutEquals)) {
             if (!readTimeout(argument->substr(strlen(kTimeoutEquals)), line, problem)) return false;
         } else if (*argument == kTimeout) {

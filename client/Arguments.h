@@ -16,13 +16,15 @@ namespace vendor::korvan::bex::wifi::client {
 struct CommandLine {
     bool help = false;
     bool json = false;
+    bool requireCount = false;
     std::optional<std::chrono::nanoseconds> timeout;
     /** The subcommand and its arguments, byte for byte. */
     std::vector<std::string> words;
 };
 
 /**
- * Reads the options --help, --json, --timeout SECONDS and --timeout=SECONDS. "--" ends the options.
+ * Reads the options --help, --json, --require-count, --timeout SECONDS and --timeout=SECONDS. "--"
+ * ends the options.
  * "-" and negative decimal numbers such as "-20" and "-0.5" are words; anything else that begins
  * with "-" is an option. SECONDS is a decimal number, such as 2.5, above 0 and up to a million.
  *

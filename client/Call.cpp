@@ -46,11 +46,12 @@ void applyWait(const Waited& waited, Outcome* outcome) {
 
 Outcome callService(const Request& request, const FindService& find,
                     std::optional<std::chrono::nanoseconds> timeout, const Progress& progress) {
+    Outcome outcome;
+    outcome.started = std::chrono::system_clock::now();
     const Clock::time_point start = Clock::now();
     const auto shared = std::make_shared<Shared>();
     const Waited waited = waitFor([request, find, shared] { work(request, find, shared.get()); },
                                   timeout ? start + *timeout : kNever, progress);
-    Outcome outcome;
     outcome.stage = shared->stage;
     if (waited.end == Waited::End::done) {
         outcome.answer = shared->answer;

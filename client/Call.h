@@ -46,6 +46,8 @@ struct Outcome {
     Stage stage = Stage::lookup;
     Answer answer;
     int number = 0;
+    /** When the search began. */
+    std::chrono::system_clock::time_point started{};
     /** From the begin of the search to the end of the call. */
     std::chrono::nanoseconds duration{};
 };

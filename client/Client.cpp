@@ -137,7 +137,7 @@ std::string stopJson(const std::string& channel, const Stopped& stopped, const R
     }
     JsonObject object = jsonHead(kStop, JsonObject().addText("channel", channel), report);
     object.add("calls", calls.str());
-    addCourse(stopped.outcome, &object);
+    addCourse(stopped.outcome, !stopped.off, &object);
     return withEnding(object, report);
 }
 
@@ -169,8 +169,16 @@ int call(const CommandLine& line, const Surroundings& to) {
         const Command* command = line.words.empty() ? nullptr : findCommand(line.words[0]);
         return wrongUsage(to, problem, command ? command->name : nullptr);
     }
+    if (line.requireCount && !request.command->result->counts) {
+        return wrongUsage(to, std::string(request.command->name) + " has no count to require",
+                          request.command->name);
+    }
     const Outcome outcome = callWatched(request, line, to);
-    const Report report = judge(request, outcome);
+    Report report = judge(request, outcome);
+    if (report.exitCode == kSuccess && line.requireCount && !packetCount(outcome.answer.text)) {
+        report = {kNoCount, std::string(request.command->name) +
+                                    " answered no count: " + jsonString(outcome.answer.text)};
+    }
 
     std::string text;
     if (line.json) {

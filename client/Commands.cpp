@@ -58,13 +58,13 @@ constexpr ResultKind
     kMimo{ResultKind::Type::boolean, "true when the device declares MIMO support", "", ""},
     kStarted{ResultKind::Type::text,
              "\"ok\" or \"failure\", or the packet count at the start, as the chip family defines",
-             "failure", kCommandLog},
+             "failure", kCommandLog, true},
     kAxStarted{ResultKind::Type::text,
                "\"ok\" or \"failure\"; one blank on the WCN chips, which only enter test mode",
-               "failure", kCommandLog},
+               "failure", kCommandLog, true},
     kPackets{ResultKind::Type::text,
              "the packets received, in decimal; on most Qualcomm chips with \"Rx: \" in front; no "
-             "number when the chip's tool printed none", "failure", kCommandLog};
+             "number when the chip's tool printed none", "failure", kCommandLog, true};
 // clang-format on
 
 const std::vector<Command> kCommands = {
@@ -187,6 +187,15 @@ std::string wrongCount(const Command& command, size_t given) {
 
 bool Command::tellsFailure(const Answer& answer) const {
     return *result->failure != '\0' && answer.text == result->failure;
+}
+
+std::optional<std::string> packetCount(const std::string& answer) {
+    std::string number = ::android::base::Trim(answer);
+    if (::android::base::StartsWith(number, "Rx: ")) number.erase(0, 4);
+    if (number.empty() || number.find_first_not_of("0123456789") != number.npos) {
+        return std::nullopt;
+    }
+    return number.erase(0, std::min(number.find_first_not_of('0'), number.size() - 1));
 }
 
 const std::vector<Command>& commands() {

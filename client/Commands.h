@@ -3,6 +3,7 @@
 
 #pragma once
 
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -42,6 +43,8 @@ struct ResultKind {
     const char* failure;
     /** Where to look after that answer. */
     const char* advice;
+    /** Whether it may hold a count of packets. */
+    bool counts = false;
 };
 
 /** One argument as the service gets it. */
@@ -61,6 +64,13 @@ struct Answer {
     /** The platform's description of the failed transaction, for people. */
     std::string transportError;
 };
+
+/**
+ * The count of packets in an answer, in decimal without leading zeros; nothing when it holds none.
+ *
+ * @param answer A number, which "Rx: " may precede.
+ */
+std::optional<std::string> packetCount(const std::string& answer);
 
 /** One method of the interface. */
 struct Command {

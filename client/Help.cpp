@@ -23,6 +23,7 @@ Options, before or after the method:
   --timeout SECONDS  wait for the service to start, and give up after SECONDS (such as 2.5)
                      altogether; without it the service must run, and may take its time. The
                      doctor gives up after 5 seconds without it, stop after 60
+  --require-count    end with 7 when the answer holds no count of packets
   --                 end of the options; needed before an argument that begins with "-", unless
                      it is a number
   --help             explain
@@ -36,6 +37,7 @@ Exit codes:
   4  the transport failed in the call
   5  the deadline of --timeout passed
   6  the result could not be written to stdout
+  7  the answer holds no count, with --require-count
   130, 143  SIGINT (Ctrl-C) or SIGTERM ended the wait; nothing tells the service
 
 Methods:

@@ -6,15 +6,41 @@
 #include <android-base/stringprintf.h>
 
 #include <cstring>
+#include <ctime>
 
 #include "client/Help.h"
+#include "client/base/Version.h"
 
 namespace vendor::korvan::bex::wifi::client {
 namespace {
 
-std::string milliseconds(std::chrono::nanoseconds duration) {
+std::string inMilliseconds(std::chrono::nanoseconds duration) {
     const long long us = std::chrono::duration_cast<std::chrono::microseconds>(duration).count();
     return ::android::base::StringPrintf("%lld.%03lld", us / 1000, us % 1000);
+}
+
+/** As RFC 3339 has it, UTC. */
+std::string timestamp(std::chrono::system_clock::time_point time) {
+    using namespace std::chrono;
+    const auto ms = duration_cast<milliseconds>(time.time_since_epoch()).count();
+    const auto seconds = static_cast<time_t>(ms / 1000);
+    struct tm utc = {};
+    gmtime_r(&seconds, &utc);
+    char text[sizeof("2026-01-01T00:00:00")];
+    strftime(text, sizeof(text), "%Y-%m-%dT%H:%M:%S", &utc);
+    return ::android::base::StringPrintf("%s.%03dZ", text, static_cast<int>(ms % 1000));
+}
+
+const char* stageName(Stage stage) {
+    switch (stage) {
+        case Stage::lookup:
+            return "lookup";
+        case Stage::call:
+            return "call";
+        case Stage::done:
+            break;
+    }
+    return "done";
 }
 
 std::string channelOf(const Request& request) {
@@ -94,8 +120,14 @@ JsonObject jsonHead(const std::string& method, const JsonObject& arguments, cons
     return object;
 }
 
-void addCourse(const Outcome& outcome, JsonObject* object) {
-    object->add("duration_ms", milliseconds(outcome.duration));
+void addCourse(const Outcome& outcome, std::optional<bool> mayBeOn, JsonObject* object) {
+    object->add("radio_may_be_on", !mayBeOn   ? "null"
+                                   : *mayBeOn ? "true"
+                                              : "false")
+            .addText("stage", stageName(outcome.stage))
+            .addText("started_at", timestamp(outcome.started))
+            .add("duration_ms", inMilliseconds(outcome.duration))
+            .addText("client_version", kVersion);
 }
 
 std::string withEnding(JsonObject object, const Report& report) {
@@ -106,13 +138,16 @@ std::string withEnding(JsonObject object, const Report& report) {
 
 std::string jsonReport(const Request& request, const Outcome& outcome, const Report& report) {
     JsonObject arguments;
+    JsonObject inHex;
     for (size_t i = 0; i < request.values.size(); ++i) {
         const ArgumentKind& kind = *request.command->arguments[i];
         const Value& value = request.values[i];
         if (kind.type == ArgumentKind::Type::boolean) {
             arguments.add(kind.name, value.flag ? "true" : "false");
         } else {
-            arguments.addText(kind.name, value.text);
+            bool exact = true;
+            arguments.add(kind.name, jsonString(value.text, &exact));
+            if (!exact) inHex.addText(kind.name, hexDigits(value.text));
         }
     }
     bool exact = true;
@@ -123,9 +158,14 @@ std::string jsonReport(const Request& request, const Outcome& outcome, const Rep
         value = text ? jsonString(outcome.answer.text, &exact) : outcome.answer.text;
     }
     JsonObject object = jsonHead(request.command->name, arguments, report);
+    if (!inHex.empty()) object.add("arguments_hex", inHex.str());
     object.add("value", value);
     if (!exact) object.addText("value_hex", hexDigits(outcome.answer.text));
-    addCourse(outcome, &object);
+    if (request.command->result->counts) {
+        object.add("count", packetCount(outcome.answer.text).value_or("null"));
+    }
+    const bool started = mayHaveStarted(request, outcome);
+    addCourse(outcome, started ? std::optional<bool>(true) : std::nullopt, &object);
     return withEnding(object, report);
 }
 

@@ -3,6 +3,7 @@
 
 #pragma once
 
+#include <optional>
 #include <string>
 
 #include "client/Call.h"
@@ -29,6 +30,8 @@ enum ExitCode {
     kTooLate = 5,
     /** The result could not be written. */
     kNotWritten = 6,
+    /** The answer holds no count of packets, and one was required. */
+    kNoCount = 7,
     /** And the number of the signal that ended the wait for an answer, as shells have it. */
     kSignalled = 128,
 };
@@ -54,11 +57,15 @@ std::string stopCommandLine(const std::string& channel);
 /** The object that --json prints of a call, with a newline. */
 std::string jsonReport(const Request& request, const Outcome& outcome, const Report& report);
 
-/** What the JSON objects of all calls begin with: whose they are, and when and how they ran. */
+/** What the JSON objects of all calls begin with. */
 JsonObject jsonHead(const std::string& method, const JsonObject& arguments, const Report& report);
 
-/** The members that tell of the call's course. */
-void addCourse(const Outcome& outcome, JsonObject* object);
+/**
+ * The members that tell of the call's course.
+ *
+ * @param mayBeOn Whether the radio may be on; nothing when the call does not tell.
+ */
+void addCourse(const Outcome& outcome, std::optional<bool> mayBeOn, JsonObject* object);
 
 /** The object with the members that end every report, and a newline. */
 std::string withEnding(JsonObject object, const Report& report);

@@ -164,6 +164,7 @@ std::vector<std::string> proofOf(const std::string& family) {
 
 Stopped stopRadio(const std::string& channel, const std::string& family, const FindService& find,
                   std::chrono::nanoseconds timeout, const Progress& progress) {
+    const auto started = std::chrono::system_clock::now();
     const Clock::time_point start = Clock::now();
     const auto shared = std::make_shared<Shared>();
     const auto work = std::make_shared<Work>(channel, family, shared);
@@ -172,6 +173,7 @@ Stopped stopRadio(const std::string& channel, const std::string& family, const F
     Stopped stopped = shared->stopped;
     applyWait(waited, &stopped.outcome);
     if (stopped.outcome.ending == Ending::answered) stopped.outcome.stage = Stage::done;
+    stopped.outcome.started = started;
     stopped.outcome.duration = Clock::now() - start;
     return stopped;
 }

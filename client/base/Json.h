@@ -31,6 +31,7 @@ class JsonObject {
     JsonObject& add(std::string_view name, std::string_view json);
     /** Adds a member whose value is text. */
     JsonObject& addText(std::string_view name, std::string_view text);
+    bool empty() const { return mMembers.empty(); }
     std::string str() const { return "{" + mMembers + "}"; }
 
   private:

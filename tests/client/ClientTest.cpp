@@ -33,10 +33,14 @@ MATCHER_P(IsOneLineWith, text, "") {
            arg.rfind("bex-wifi-client: ", 0) == 0 && arg.find(text) != arg.npos;
 }
 
-// The one thing that differs from run to run.
-std::string withoutDuration(const std::string& json) {
-    return std::regex_replace(json, std::regex("\"duration_ms\":[0-9]+\\.[0-9]{3},"),
-                              "\"duration_ms\":D,");
+// What tells of the call's course differs from run to run.
+std::string withoutCourse(const std::string& json) {
+    return std::regex_replace(json,
+                              std::regex(R"("radio_may_be_on":(true|false|null),"stage":"[a-z]+",)"
+                                         R"("started_at":"[0-9-]+T[0-9:]+\.[0-9]{3}Z",)"
+                                         R"("duration_ms":[0-9]+\.[0-9]{3},)"
+                                         R"("client_version":"[0-9.]+",)"),
+                              "COURSE,");
 }
 
 class ClientTest : public ::testing::Test {
@@ -239,9 +243,9 @@ TEST_F(ClientDeadlineTest, ExitCode5InTheCall) {
 TEST_F(ClientDeadlineTest, JsonAfterTheDeadline) {
     mService->onCall = [this] { wait(); };
     EXPECT_EQ(run({"--timeout", "2", "--json", "RunRxStop", "6"}), 5);
-    EXPECT_EQ(withoutDuration(out()),
+    EXPECT_EQ(withoutCourse(out()),
               R"({"schema_version":1,"method":"RunRxStop","arguments":{"channel":"6"},)"
-              R"("ok":false,"value":null,"duration_ms":D,"exit_code":5,"error":)"
+              R"("ok":false,"value":null,"count":null,COURSE,"exit_code":5,"error":)"
               R"("the deadline passed in RunRxStop: the service's commands may still be running"})"
               "\n");
     EXPECT_THAT(err(), IsOneLineWith("the deadline passed in RunRxStop"));
@@ -249,9 +253,9 @@ TEST_F(ClientDeadlineTest, JsonAfterTheDeadline) {
 
 TEST_F(ClientTest, JsonOfSuccess) {
     EXPECT_EQ(run({"RunTxStop", "6", "--json"}), 0);
-    EXPECT_EQ(withoutDuration(out()),
+    EXPECT_EQ(withoutCourse(out()),
               R"({"schema_version":1,"method":"RunTxStop","arguments":{"channel":"6"},)"
-              R"("ok":true,"value":0,"duration_ms":D,"exit_code":0})"
+              R"("ok":true,"value":0,COURSE,"exit_code":0})"
               "\n");
     EXPECT_EQ(err(), "");
 }
@@ -259,29 +263,30 @@ TEST_F(ClientTest, JsonOfSuccess) {
 TEST_F(ClientTest, JsonNamesEveryArgumentAndWritesFlagsAsFlags) {
     mService->text = "ok";
     EXPECT_EQ(run({"--json", "RunRxNStart", "6", "20", "a\"\n\xFF", "1", ""}), 0);
-    EXPECT_EQ(withoutDuration(out()),
+    EXPECT_EQ(withoutCourse(out()),
               R"({"schema_version":1,"method":"RunRxNStart","arguments":{"channel":"6",)"
               R"("bandwidth":"20","rate":"a\"\n)"
               "\uFFFD"
-              R"(","vht":true,"antenna":""},"ok":true,"value":"ok","duration_ms":D,"exit_code":0})"
+              R"(","vht":true,"antenna":""},"ok":true,"arguments_hex":{"rate":"61220aff"},)"
+              R"("value":"ok","count":null,COURSE,"exit_code":0})"
               "\n");
 }
 
 TEST_F(ClientTest, JsonWithoutArgumentsAndWithAFlag) {
     mService->flag = true;
     EXPECT_EQ(run({"--json", "isMimoSupport"}), 0);
-    EXPECT_EQ(withoutDuration(out()),
+    EXPECT_EQ(withoutCourse(out()),
               R"({"schema_version":1,"method":"isMimoSupport","arguments":{},"ok":true,)"
-              R"("value":true,"duration_ms":D,"exit_code":0})"
+              R"("value":true,COURSE,"exit_code":0})"
               "\n");
 }
 
 TEST_F(ClientTest, JsonOfAFailureKeepsTheValue) {
     mService->number = -1;
     EXPECT_EQ(run({"--json", "snifferStop"}), 1);
-    EXPECT_EQ(withoutDuration(out()),
+    EXPECT_EQ(withoutCourse(out()),
               R"({"schema_version":1,"method":"snifferStop","arguments":{},"ok":false,"value":-1,)"
-              R"("duration_ms":D,"exit_code":1,"error":"snifferStop answered -1: which command )"
+              R"(COURSE,"exit_code":1,"error":"snifferStop answered -1: which command )"
               "failed is in the service's log (logcat, tags that begin with "
               "\\\"wifi@1.0-\\\")\"}\n");
     EXPECT_THAT(err(), IsOneLineWith("snifferStop answered -1"));
@@ -290,10 +295,10 @@ TEST_F(ClientTest, JsonOfAFailureKeepsTheValue) {
 TEST_F(ClientTest, JsonWithoutAService) {
     mService = nullptr;
     EXPECT_EQ(run({"--json", "snifferStop"}), 3);
-    EXPECT_THAT(withoutDuration(out()),
+    EXPECT_THAT(withoutCourse(out()),
                 StartsWith(
                         R"({"schema_version":1,"method":"snifferStop","arguments":{},"ok":false,)"
-                        R"("value":null,"duration_ms":D,"exit_code":3,"error":")"
+                        R"("value":null,COURSE,"exit_code":3,"error":")"
                         "vendor.korvan.bex.wifi@1.0::IWifiService/default is not registered"));
     EXPECT_THAT(out(), ::testing::EndsWith("find it?\"}\n"));
     EXPECT_THAT(err(), IsOneLineWith("is not registered"));
@@ -302,10 +307,11 @@ TEST_F(ClientTest, JsonWithoutAService) {
 TEST_F(ClientTest, JsonOfAFailedTransport) {
     mService->broken = true;
     EXPECT_EQ(run({"--json", "RunRxStop", "6"}), 4);
-    EXPECT_THAT(withoutDuration(out()),
-                AllOf(StartsWith(R"({"schema_version":1,"method":"RunRxStop",)"
-                                 R"("arguments":{"channel":"6"},"ok":false,"value":null,)"
-                                 R"("duration_ms":D,"exit_code":4,"error":"RunRxStop failed in )"),
+    EXPECT_THAT(withoutCourse(out()),
+                AllOf(StartsWith(
+                              R"({"schema_version":1,"method":"RunRxStop",)"
+                              R"("arguments":{"channel":"6"},"ok":false,"value":null,)"
+                              R"("count":null,COURSE,"exit_code":4,"error":"RunRxStop failed in )"),
                       ::testing::EndsWith("\\\"\"}\n")));
     EXPECT_THAT(err(), IsOneLineWith("RunRxStop failed in the transport"));
 }
@@ -313,11 +319,64 @@ TEST_F(ClientTest, JsonOfAFailedTransport) {
 TEST_F(ClientTest, JsonOfATextThatIsNotUtf8AddsItsBytes) {
     mService->text = "a\xFF\x01";
     EXPECT_EQ(run({"--json", "RunRxStop", "6"}), 0);
-    EXPECT_EQ(withoutDuration(out()),
+    EXPECT_EQ(withoutCourse(out()),
               R"({"schema_version":1,"method":"RunRxStop","arguments":{"channel":"6"},"ok":true,)"
-              "\"value\":\"a\uFFFD\\u0001\",\"value_hex\":\"61ff01\","
-              R"("duration_ms":D,"exit_code":0})"
+              "\"value\":\"a\uFFFD\\u0001\",\"value_hex\":\"61ff01\",\"count\":null,"
+              R"(COURSE,"exit_code":0})"
               "\n");
+}
+
+TEST_F(ClientTest, JsonHoldsTheCountAsANumber) {
+    for (const auto& [text, count] :
+         std::vector<std::pair<std::string, std::string>>{{"48", "48"},
+                                                          {"Rx: 041", "41"},
+                                                          {"Rx: 0\n", "0"},
+                                                          {"ok", "null"},
+                                                          {"Rx: ", "null"},
+                                                          {"Rx: goodPackets", "null"},
+                                                          {"", "null"},
+                                                          {" ", "null"},
+                                                          {"-1", "null"}}) {
+        mOut.str("");
+        mService->text = text;
+        EXPECT_EQ(run({"RunRxStop", "6", "--json"}), 0);
+        EXPECT_THAT(out(), HasSubstr("\"count\":" + count + ",")) << text;
+    }
+}
+
+TEST_F(ClientTest, ARequiredCountThatIsMissingIsAFailureOfItsOwn) {
+    mService->text = "Rx: ";
+    EXPECT_EQ(run({"RunRxStop", "6", "--require-count"}), 7);
+    EXPECT_EQ(out(), "Rx: \n");
+    EXPECT_THAT(err(), IsOneLineWith("RunRxStop answered no count: \"Rx: \""));
+    mService->text = "Rx: 12";
+    EXPECT_EQ(run({"RunRxStop", "6", "--require-count"}), 0);
+    mService->text = "failure";
+    EXPECT_EQ(run({"RunRxStop", "6", "--require-count"}), 1);
+    EXPECT_EQ(run({"RunTxStop", "6", "--require-count"}), 2);
+}
+
+TEST_F(ClientTest, JsonTellsHowFarTheCallCameAndWhatMayBeOn) {
+    const auto members = [this](const Words& call) {
+        mOut.str("");
+        run(call);
+        std::smatch found;
+        const std::string json = out();
+        std::regex_search(json, found, std::regex("\"radio_may_be_on\":.*?,\"started_at"));
+        return found.str();
+    };
+    EXPECT_THAT(members({"--json", "RunTxStStart", "6", "20", "1"}),
+                StartsWith(R"("radio_may_be_on":true,"stage":"done",)"));
+    EXPECT_THAT(members({"--json", "RunTxStop", "6"}),
+                StartsWith(R"("radio_may_be_on":null,"stage":"done",)"));
+    mService->broken = true;
+    EXPECT_THAT(members({"--json", "RunTxStStart", "6", "20", "1"}),
+                StartsWith(R"("radio_may_be_on":true,"stage":"call",)"));
+    mService = nullptr;
+    EXPECT_THAT(members({"--json", "RunTxStStart", "6", "20", "1"}),
+                StartsWith(R"("radio_may_be_on":null,"stage":"lookup",)"));
+    EXPECT_THAT(members({"--json", "stop"}),
+                StartsWith(R"("radio_may_be_on":true,"stage":"lookup",)"));
 }
 
 TEST_F(ClientTest, JsonOfALargeTextIsOneLine) {

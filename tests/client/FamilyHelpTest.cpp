@@ -56,7 +56,8 @@ TEST(FamilyHelpTest, EveryEntryIsOfAKnownFamilyMethodAndArgument) {
         const Command* command = findCommand(std::string(use.method));
         ASSERT_NE(command, nullptr);
         std::vector<std::string_view> arguments;
-        for (const ArgumentKind* argument : command->arguments) arguments.emplace_back(argument->name);
+        for (const ArgumentKind* argument : command->arguments)
+            arguments.emplace_back(argument->name);
         EXPECT_THAT(use.ignored, Each(AnyOfArray(arguments)));
         EXPECT_FALSE(use.ignored.empty() && use.remarks.empty());
     }

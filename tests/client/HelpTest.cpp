@@ -20,11 +20,12 @@ TEST(HelpTest, NamesEveryMethodOptionAndExitCode) {
         EXPECT_THAT(help, HasSubstr("\n  " + std::string(command.name) + " "));
         EXPECT_THAT(help, HasSubstr(command.summary));
     }
-    for (const char* option : {"--json", "--timeout SECONDS", "--help", "list [--json]",
-                               "doctor [--json]", "stop [--json] [CHANNEL]", "  -- "}) {
+    for (const char* option :
+         {"--json", "--require-count", "--timeout SECONDS", "--help", "list [--json]",
+          "doctor [--json]", "stop [--json] [CHANNEL]", "  -- "}) {
         EXPECT_THAT(help, HasSubstr(option));
     }
-    for (int exitCode = 0; exitCode <= 6; ++exitCode) {
+    for (int exitCode = 0; exitCode <= 7; ++exitCode) {
         EXPECT_THAT(help, HasSubstr("\n  " + std::to_string(exitCode) + "  "));
     }
 }

@@ -16,6 +16,8 @@ import tempfile
 
 import pytest
 
+from support import output
+
 CLIENT = os.environ["BEX_WIFI_CLIENT"]
 SERVED_FAKE = os.environ["SERVED_FAKE"]
 
@@ -55,7 +57,9 @@ def service(phone):
 
 def run(*arguments, **options):
     options = {"stdout": subprocess.PIPE, "stderr": subprocess.PIPE, "timeout": 30, **options}
-    return subprocess.run([CLIENT, *arguments], stdin=subprocess.DEVNULL, check=False, **options)
+    done = subprocess.run([CLIENT, *arguments], stdin=subprocess.DEVNULL, check=False, **options)
+    output.validate(arguments, done.stdout)
+    return done
 
 
 def only_line(done):

@@ -17,6 +17,7 @@ import tempfile
 import pytest
 
 import servicelog
+from support import output
 from support.waiting import wait_for
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
@@ -119,7 +120,9 @@ class Phone:
         return result
 
     def client(self, *arguments):
-        return self.run(CLIENT, *arguments)
+        done = self.run(CLIENT, *arguments)
+        output.validate(arguments, done.stdout)
+        return done
 
     def outside(self, *arguments, **options):
         """Starts a program of this machine that is a client of the phone's service: it is there sooner
@@ -135,6 +138,7 @@ class Phone:
         """The client outside: (exit code, stdout, stderr)."""
         with self.start(*arguments) as client:
             out, err = client.communicate(timeout=60)
+        output.validate(arguments, out)
         return client.returncode, out, err
 
     def commands(self, since=0):
