@@ -54,10 +54,12 @@ bool readCommandLine(const std::vector<std::string>& arguments, CommandLine* lin
         }
         if (!isOption(*argument)) {
             line->words.push_back(*argument);
-        } else if (*argument == "--help") {
+        } else if (*argument == "--help" || *argument == "-h") {
             line->help = true;
         } else if (*argument == "--json") {
             line->json = true;
+        } else if (*argument == "--version") {
+            line->version = true;
         } else if (*argument == "--require-count") {
             line->requireCount = true;
         } else if (StartsWith(*argument, kTimeoutEquals)) {

@@ -15,6 +15,7 @@ namespace vendor::korvan::bex::wifi::client {
 /** A command line that has been read. */
 struct CommandLine {
     bool help = false;
+    bool version = false;
     bool json = false;
     bool requireCount = false;
     std::optional<std::chrono::nanoseconds> timeout;
@@ -23,8 +24,8 @@ struct CommandLine {
 };
 
 /**
- * Reads the options --help, --json, --require-count, --timeout SECONDS and --timeout=SECONDS. "--"
- * ends the options.
+ * Reads the options --help (-h), --version, --json, --require-count, --timeout SECONDS and
+ * --timeout=SECONDS. "--" ends the options.
  * "-" and negative decimal numbers such as "-20" and "-0.5" are words; anything else that begins
  * with "-" is an option. SECONDS is a decimal number, such as 2.5, above 0 and up to a million.
  *

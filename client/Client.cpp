@@ -16,6 +16,7 @@
 namespace vendor::korvan::bex::wifi::client {
 namespace {
 
+constexpr char kHelp[] = "help";
 constexpr char kList[] = "list";
 constexpr char kDoctor[] = "doctor";
 constexpr char kStop[] = "stop";
@@ -153,12 +154,12 @@ int stop(const CommandLine& line, const Surroundings& to) {
     return conclude(to, line.json ? stopJson(channel, stopped, report) : stopText(stopped), report);
 }
 
-int help(const CommandLine& line, const Surroundings& to) {
-    const bool method = !line.words.empty() && line.words[0] != kList && line.words[0] != kDoctor &&
-                        line.words[0] != kStop;
-    if (!method) return print(to, helpText());
-    const Command* command = findCommand(line.words[0]);
-    if (command == nullptr) return wrongUsage(to, unknownCommand(line.words[0]));
+/** Explains a subcommand, or the whole client. */
+int help(const std::vector<std::string>& words, const Surroundings& to) {
+    if (words.empty()) return print(to, helpText());
+    if (const auto text = helpOnTopic(words[0])) return print(to, *text);
+    const Command* command = findCommand(words[0]);
+    if (command == nullptr) return wrongUsage(to, unknownCommand(words[0]));
     return print(to, helpText(*command) + familyHelp(phoneFamily(), *command));
 }
 
@@ -195,10 +196,13 @@ int runClient(const std::vector<std::string>& arguments, const Surroundings& sur
     CommandLine line;
     std::string problem;
     if (!readCommandLine(arguments, &line, &problem)) return wrongUsage(surroundings, problem);
-    if (line.help) return help(line, surroundings);
-    if (!line.words.empty() && line.words[0] == kList) return list(line, surroundings);
-    if (!line.words.empty() && line.words[0] == kDoctor) return doctor(line, surroundings);
-    if (!line.words.empty() && line.words[0] == kStop) return stop(line, surroundings);
+    if (line.version) return print(surroundings, versionText());
+    const std::string first = line.words.empty() ? "" : line.words[0];
+    if (first == kHelp) return help({line.words.begin() + 1, line.words.end()}, surroundings);
+    if (line.help) return help(line.words, surroundings);
+    if (first == kList) return list(line, surroundings);
+    if (first == kDoctor) return doctor(line, surroundings);
+    if (first == kStop) return stop(line, surroundings);
     return call(line, surroundings);
 }
 

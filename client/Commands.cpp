@@ -5,6 +5,9 @@
 
 #include <android-base/strings.h>
 
+#include <algorithm>
+#include <cctype>
+#include <numeric>
 #include <optional>
 
 #include "client/MethodCall.h"
@@ -19,25 +22,25 @@ constexpr auto kBoolean = ArgumentKind::Type::boolean;
 // clang-format off
 constexpr ArgumentKind
     kChannel{"channel", kText, "the IEEE 802.11 channel number", "",
-             "decimal: 1 to 14 (2.4 GHz), 36 and up (5 GHz)"},
-    kBandwidth{"bandwidth", kText, "the channel width", "MHz", "20, 40, 80 or 160"},
-    kNarrowBandwidth{"bandwidth", kText, "the channel width", "MHz", "20, 40 or 80"},
+             "decimal: 1 to 14 (2.4 GHz), 36 and up (5 GHz)", "6"},
+    kBandwidth{"bandwidth", kText, "the channel width", "MHz", "20, 40, 80 or 160", "20"},
+    kNarrowBandwidth{"bandwidth", kText, "the channel width", "MHz", "20, 40 or 80", "20"},
     kRate{"rate", kText, "the data rate", "Mbit/s",
-          "1, 2, 5.5, 6, 9, 11, 12, 18, 24, 36, 48 or 54"},
-    kMcs{"rate", kText, "the MCS index", "", "decimal, such as 0 or 7"},
+          "1, 2, 5.5, 6, 9, 11, 12, 18, 24, 36, 48 or 54", "54"},
+    kMcs{"rate", kText, "the MCS index", "", "decimal, such as 0 or 7", "7"},
     kPower{"power", kText, "the transmit power", "that of the chip's tool",
-           "as the chip's tool expects"},
+           "as the chip's tool expects", "15"},
     kVht{"vht", kBoolean, "802.11ac (VHT) rates when true, 802.11n (HT) rates when false", "",
-         "true, false, 1 or 0"},
+         "true, false, 1 or 0", "false"},
     kGuardInterval{"guardInterval", kText, "the guard interval", "that of the chip's tool",
-                   "as the chip's tool expects"},
+                   "as the chip's tool expects", "0"},
     kTxAntenna{"antenna", kText, "the transmit chain or chain mask", "",
-               "as the chip's tool expects"},
+               "as the chip's tool expects", "1"},
     kRxAntenna{"antenna", kText, "the receive chain or chain mask", "",
-               "as the chip's tool expects"},
+               "as the chip's tool expects", "1"},
     kSsid{"ssid", kText, "the network name of the open access point", "",
-          "any text; a name with blanks becomes several words"},
-    kAddress{"address", kText, "the IPv4 address to give to the interface", "", "dotted decimal"};
+          "any text; a name with blanks becomes several words", "test-ap"},
+    kAddress{"address", kText, "the IPv4 address to give to the interface", "", "dotted decimal", "192.168.1.7"};
 
 constexpr char kCommandLog[] =
     "which command failed is in the service's log (logcat, tags that begin with \"wifi@1.0-\")";
@@ -172,6 +175,27 @@ std::optional<bool> readFlag(const std::string& text) {
     return std::nullopt;
 }
 
+// Of letters, whatever their case, that are to be inserted, left out or replaced.
+constexpr size_t kFarthestMisspelling = 3;
+
+/** The number of such letters; a higher one for texts that are far apart in length. */
+size_t editDistance(const std::string& text, const std::string& other) {
+    if (text.size() > other.size() + kFarthestMisspelling) return kFarthestMisspelling + 1;
+    std::vector<size_t> row(other.size() + 1);
+    std::iota(row.begin(), row.end(), 0);
+    for (size_t i = 0; i < text.size(); ++i) {
+        size_t diagonal = row[0]++;
+        for (size_t j = 0; j < other.size(); ++j) {
+            const bool same = tolower(static_cast<unsigned char>(text[i])) ==
+                              tolower(static_cast<unsigned char>(other[j]));
+            const size_t replaced = diagonal + (same ? 0 : 1);
+            diagonal = row[j + 1];
+            row[j + 1] = std::min({replaced, row[j] + 1, row[j + 1] + 1});
+        }
+    }
+    return row.back();
+}
+
 std::string wrongCount(const Command& command, size_t given) {
     const size_t expected = command.arguments.size();
     std::vector<const char*> names;
@@ -210,13 +234,17 @@ const Command* findCommand(const std::string& name) {
 }
 
 std::string unknownCommand(const std::string& name) {
-    std::string problem = "unknown method " + jsonString(name);
+    const Command* nearest = nullptr;
+    size_t distance = kFarthestMisspelling + 1;
     for (const Command& command : kCommands) {
-        if (::android::base::EqualsIgnoreCase(name, command.name)) {
-            problem.append(": did you mean ").append(command.name).append("?");
+        const size_t edits = editDistance(name, command.name);
+        if (edits < distance) {
+            distance = edits;
+            nearest = &command;
         }
     }
-    return problem;
+    const std::string problem = "unknown method " + jsonString(name);
+    return nearest == nullptr ? problem : problem + ", perhaps " + nearest->name;
 }
 
 bool readRequest(const std::vector<std::string>& words, Request* request, std::string* problem) {

@@ -31,6 +31,8 @@ struct ArgumentKind {
     const char* unit;
     /** The forms that the service makes sense of. Only a boolean is checked by the client. */
     const char* accepted;
+    /** One of them. */
+    const char* example;
 };
 
 /** What a method answers. */
@@ -100,7 +102,7 @@ const std::vector<Command>& commands();
 /** The method of exactly this name, or null. */
 const Command* findCommand(const std::string& name);
 
-/** Tells, on one line and quoting the name, that there is no such method. */
+/** Tells, on one line and quoting the name, that there is no such method, and which is meant. */
 std::string unknownCommand(const std::string& name);
 
 /**

@@ -3,35 +3,42 @@
 
 #include "client/Help.h"
 
+#include <android-base/strings.h>
+
 #include "client/base/Json.h"
+#include "client/base/Version.h"
 
 namespace vendor::korvan::bex::wifi::client {
 namespace {
 
 constexpr char kUsage[] =
-        R"(Calls the Wi-Fi radio test service, vendor.korvan.bex.wifi@1.0::IWifiService/default.
+        R"(Calls the Wi-Fi radio test service,
+vendor.korvan.bex.wifi@1.0::IWifiService/default.
 
 Usage:
-  bex-wifi-client [OPTION]... METHOD [ARGUMENT]...   call a method and print what it answers
-  bex-wifi-client METHOD --help                      explain a method and its arguments
+  bex-wifi-client [OPTION]... METHOD [ARGUMENT]...   call a method
+  bex-wifi-client help METHOD                        explain a method
   bex-wifi-client list [--json]                      name the methods
   bex-wifi-client stop [--json] [CHANNEL]            end whatever the radio does
-  bex-wifi-client doctor [--json]                    find out what keeps the service from working
+  bex-wifi-client doctor [--json]                    find out why nothing works
+  bex-wifi-client --version
 
 Options, before or after the method:
-  --json             print one JSON object, on one line, whatever comes of the call
-  --timeout SECONDS  wait for the service to start, and give up after SECONDS (such as 2.5)
-                     altogether; without it the service must run, and may take its time. The
-                     doctor gives up after 5 seconds without it, stop after 60
+  --json             print one JSON object, on one line, whatever comes of the
+                     call
+  --timeout SECONDS  wait for the service to start, and give up after SECONDS
+                     (such as 2.5) altogether; without it the service must run,
+                     and may take its time. The doctor gives up after 5 seconds
+                     without it, stop after 60
   --require-count    end with 7 when the answer holds no count of packets
-  --                 end of the options; needed before an argument that begins with "-", unless
-                     it is a number
-  --help             explain
+  --                 end of the options; needed before an argument that begins
+                     with "-", unless it is a number
+  --help, -h         explain
 
 Exit codes:
   0  success
-  1  the service answered -1 or "failure"; the doctor found a problem; stop did not prove
-     that the radio is off
+  1  the service answered -1 or "failure"; the doctor found a problem; stop did
+     not prove that the radio is off
   2  wrong usage
   3  the service cannot be found
   4  the transport failed in the call
@@ -43,6 +50,35 @@ Exit codes:
 Methods:
 )";
 
+struct Topic {
+    const char* name;
+    const char* text;
+};
+
+constexpr Topic kTopics[] = {
+        {"list", R"(Usage: bex-wifi-client list [--json]
+Names the methods, a line for each. With --json also their arguments and
+results.
+)"},
+        {"doctor", R"(Usage: bex-wifi-client doctor [--json] [--timeout SECONDS]
+Looks for what keeps the service from working, on the phone where it runs, best
+as root. It changes nothing and calls no method. Each problem comes with what to
+do about it. Gives up on a silent service after 5 seconds, or after SECONDS.
+
+Ends with 0 when it found no problem, else with 1.
+)"},
+        {"stop", R"(Usage: bex-wifi-client stop [--json] [--timeout SECONDS] [CHANNEL]
+Ends transmission, tone, reception and monitor mode: calls RunTxStop,
+RunTxStStop, RunRxStop and snifferStop, and prints each answer. It waits for a
+call that is still under way and repeats its own afterwards. Reloads the driver
+and leaves the interface down. Gives up after 60 seconds, or after SECONDS.
+
+Ends with 0 only when the answers prove that the radio is off, with 1 when they
+do not.
+)"},
+};
+
+constexpr size_t kColumns = 80;
 constexpr size_t kNameWidth = 16;
 
 std::string padded(std::string text) {
@@ -50,12 +86,16 @@ std::string padded(std::string text) {
     return text;
 }
 
-std::string methodLines(const std::string& indent) {
-    std::string lines;
-    for (const Command& command : commands()) {
-        lines += indent + padded(command.name) + command.summary + "\n";
+/** The text in lines of at most kColumns where words allow it, the later ones indented. */
+std::string wrapped(std::string text, size_t indent) {
+    size_t begin = 0; // of the last line
+    while (text.size() - begin > kColumns) {
+        const size_t blank = text.rfind(' ', begin + kColumns);
+        if (blank == std::string::npos || blank <= begin + indent) break;
+        text.replace(blank, 1, "\n" + std::string(indent, ' '));
+        begin = blank + 1;
     }
-    return lines;
+    return text + "\n";
 }
 
 const char* typeName(ArgumentKind::Type type) {
@@ -101,27 +141,54 @@ std::string describe(const Command& command) {
 } // namespace
 
 std::string helpText() {
-    return kUsage + methodLines("  ");
+    std::string text = kUsage;
+    for (const Command& command : commands()) {
+        text += wrapped("  " + padded(command.name) + command.summary, 2 + kNameWidth);
+    }
+    return text;
 }
 
 std::string helpText(const Command& command) {
+    const std::string call = std::string("bex-wifi-client ") + command.name;
     std::string usage = std::string("Usage: bex-wifi-client [OPTION]... ") + command.name;
+    std::string example = "Example: " + call;
     std::string details;
     for (const ArgumentKind* argument : command.arguments) {
         usage.append(" ").append(argument->name);
-        details.append("  ").append(padded(argument->name)).append(argument->meaning);
-        if (*argument->unit != '\0') details.append("; unit: ").append(argument->unit);
-        details.append("\n  ").append(padded("")).append(argument->accepted).append("\n");
+        example.append(" ").append(argument->example);
+        std::string meaning = "  " + padded(argument->name) + argument->meaning;
+        if (*argument->unit != '\0') meaning.append("; unit: ").append(argument->unit);
+        details += wrapped(meaning, 2 + kNameWidth) +
+                   wrapped("  " + padded("") + argument->accepted, 2 + kNameWidth);
     }
     if (!details.empty()) {
         details = "\nArguments (text reaches the chip's tool as it stands, unchecked):\n" + details;
     }
-    return usage + "\n" + command.summary + "\n" + details + "\nResult (" +
-           typeName(command.result->type) + "): " + command.result->meaning + "\n";
+    return wrapped(usage, 4) + wrapped(command.summary, 0) + details + "\n" +
+           wrapped(std::string("Result (") + typeName(command.result->type) +
+                           "): " + command.result->meaning,
+                   2) +
+           example + "\n";
+}
+
+std::optional<std::string> helpOnTopic(const std::string& name) {
+    for (const Topic& topic : kTopics) {
+        if (name == topic.name) return topic.text;
+    }
+    return std::nullopt;
+}
+
+std::string versionText() {
+    return std::string("bex-wifi-client ") + kVersion + "\n" + kInterface + "\n" + kInterfaceHash +
+           "\n";
 }
 
 std::string listText() {
-    return methodLines("");
+    std::string lines;
+    for (const Command& command : commands()) {
+        lines += padded(command.name) + command.summary + "\n";
+    }
+    return lines;
 }
 
 std::string listJson() {

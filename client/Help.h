@@ -3,6 +3,7 @@
 
 #pragma once
 
+#include <optional>
 #include <string>
 
 #include "client/Commands.h"
@@ -17,8 +18,14 @@ constexpr char kSchemaVersion[] = "1";
 /** Of the whole client: how to call it, its subcommands and options, its exit codes. */
 std::string helpText();
 
-/** Of one method: each argument's meaning, unit and accepted text, and the result. */
+/** Of one method: each argument's meaning, unit and accepted text, the result, and an example. */
 std::string helpText(const Command& command);
+
+/** Of a subcommand that calls no single method: list, doctor, stop; nothing for other names. */
+std::optional<std::string> helpOnTopic(const std::string& name);
+
+/** The client's version, and the interface that it was built for. */
+std::string versionText();
 
 /** A line for each method: its name and summary. */
 std::string listText();

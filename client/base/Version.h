@@ -8,4 +8,9 @@ namespace vendor::korvan::bex::wifi::client {
 /** Of the whole project; CHANGELOG.md tells what a version brought. */
 constexpr char kVersion[] = "0.2.0";
 
+/** The interface that the client was built for, with its frozen hash. */
+constexpr char kInterface[] = "vendor.korvan.bex.wifi@1.0::IWifiService";
+constexpr char kInterfaceHash[] =
+        "14fe62731119fcaaecbf474ac0d1d069b782644bbececbe0991218032ba74d0e";
+
 } // namespace vendor::korvan::bex::wifi::client

@@ -61,7 +61,7 @@ TEST(ArgumentsTest, TwoDashesEndTheOptions) {
 
 TEST(ArgumentsTest, UnknownOptionsAreNamedOnOneLine) {
     for (const std::string option :
-         {"--jsonn", "-j", "-h", "--timeouts", "-1-2", "-1.2.3", "-.", "-0x5", "--help=1"}) {
+         {"--jsonn", "-j", "-x", "--timeouts", "-1-2", "-1.2.3", "-.", "-0x5", "--help=1"}) {
         EXPECT_EQ(problemOf({"m", option}),
                   "unknown option \"" + option +
                           "\" (an argument that begins with \"-\" goes after \"--\")");

@@ -84,7 +84,7 @@ TEST_F(DoctorCommandTest, UsageAndHelp) {
     EXPECT_EQ(mErr.str(),
               "bex-wifi-client: doctor takes no arguments; see bex-wifi-client --help\n");
     EXPECT_EQ(run({"doctor", "--help"}), 0);
-    EXPECT_EQ(mOut.str(), helpText());
+    EXPECT_EQ(mOut.str(), *helpOnTopic("doctor"));
     EXPECT_THAT(helpText(), HasSubstr("\n  bex-wifi-client doctor [--json] "));
 }
 

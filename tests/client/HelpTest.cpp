@@ -1,12 +1,16 @@
 // Copyright 2026 The BEX Wi-Fi Authors
 // SPDX-License-Identifier: Apache-2.0
 
+#include <android-base/strings.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <regex>
 
+#include "FakeService.h"
 #include "client/Help.h"
+#include "client/base/Json.h"
 
 namespace vendor::korvan::bex::wifi::client {
 namespace {
@@ -14,15 +18,53 @@ namespace {
 using ::testing::HasSubstr;
 using ::testing::StartsWith;
 
+// As it was before it was wrapped.
+std::string inOneLine(const std::string& text) {
+    return std::regex_replace(text, std::regex("\\s+"), " ");
+}
+
+TEST(HelpTest, FitsIntoEightyColumns) {
+    std::string all = helpText() + versionText();
+    for (const char* topic : {"list", "doctor", "stop"}) all += helpOnTopic(topic).value();
+    for (const Command& command : commands()) all += helpText(command);
+    for (const std::string& line : ::android::base::Split(all, "\n")) {
+        EXPECT_LE(line.size(), 80u) << line;
+        EXPECT_FALSE(::android::base::EndsWith(line, " ")) << line;
+    }
+}
+
+TEST(HelpTest, AnExampleIsACallThatTheClientTakes) {
+    for (const Command& command : commands()) {
+        const std::string help = helpText(command);
+        const size_t at = help.find("Example: bex-wifi-client ");
+        ASSERT_NE(at, std::string::npos);
+        Request request;
+        std::string problem;
+        const std::string words = ::android::base::Trim(help.substr(at + 25));
+        EXPECT_TRUE(readRequest(::android::base::Split(words, " "), &request, &problem)) << problem;
+    }
+}
+
+TEST(HelpTest, TheVersionNamesTheInterfacesHash) {
+    const ::android::sp<FakeService> service = new FakeService;
+    std::string hash;
+    service->IWifiService::getHashChain([&hash](const auto& chain) {
+        hash = hexDigits({reinterpret_cast<const char*>(chain[0].data()), chain[0].size()});
+    });
+    EXPECT_THAT(versionText(), HasSubstr("\n" + hash + "\n"));
+    EXPECT_THAT(versionText(),
+                HasSubstr(std::string("\n") + V1_0::IWifiService::descriptor + "\n"));
+}
+
 TEST(HelpTest, NamesEveryMethodOptionAndExitCode) {
     const std::string help = helpText();
     for (const Command& command : commands()) {
         EXPECT_THAT(help, HasSubstr("\n  " + std::string(command.name) + " "));
-        EXPECT_THAT(help, HasSubstr(command.summary));
+        EXPECT_THAT(inOneLine(help), HasSubstr(command.summary));
     }
     for (const char* option :
-         {"--json", "--require-count", "--timeout SECONDS", "--help", "list [--json]",
-          "doctor [--json]", "stop [--json] [CHANNEL]", "  -- "}) {
+         {"--json", "--require-count", "--timeout SECONDS", "--help, -h", "--version",
+          "list [--json]", "doctor [--json]", "stop [--json] [CHANNEL]", "  -- "}) {
         EXPECT_THAT(help, HasSubstr(option));
     }
     for (int exitCode = 0; exitCode <= 7; ++exitCode) {
@@ -33,16 +75,16 @@ TEST(HelpTest, NamesEveryMethodOptionAndExitCode) {
 TEST(HelpTest, EveryMethodExplainsEachArgumentAndItsResult) {
     for (const Command& command : commands()) {
         SCOPED_TRACE(command.name);
-        const std::string help = helpText(command);
+        const std::string help = inOneLine(helpText(command));
         std::string usage = "Usage: bex-wifi-client [OPTION]... " + std::string(command.name);
         for (const ArgumentKind* argument : command.arguments) {
             usage += " " + std::string(argument->name);
-            EXPECT_THAT(help, HasSubstr("\n  " + std::string(argument->name) + " "));
+            EXPECT_THAT(help, HasSubstr(" " + std::string(argument->name) + " "));
             EXPECT_THAT(help, HasSubstr(argument->meaning));
             EXPECT_THAT(help, HasSubstr(argument->accepted));
             EXPECT_THAT(help, HasSubstr(argument->unit));
         }
-        EXPECT_THAT(help, StartsWith(usage + "\n" + command.summary + "\n"));
+        EXPECT_THAT(help, StartsWith(usage + " " + command.summary + " "));
         EXPECT_THAT(help, HasSubstr(command.result->meaning));
     }
 }
@@ -52,11 +94,12 @@ TEST(HelpTest, AMethodsHelpReadsLikeThis) {
               "Usage: bex-wifi-client [OPTION]... snifferStop\n"
               "Ends the packet capture and monitor mode; leaves the interface down.\n"
               "\n"
-              "Result (int32): 0 when every command succeeded, -1 when at least one failed; some "
-              "chip "
-              "families tolerate an insmod that fails\n");
+              "Result (int32): 0 when every command succeeded, -1 when at least one failed;\n"
+              "  some chip families tolerate an insmod that fails\n"
+              "Example: bex-wifi-client snifferStop\n");
     EXPECT_EQ(helpText(*findCommand("RunRxNStart")),
-              "Usage: bex-wifi-client [OPTION]... RunRxNStart channel bandwidth rate vht antenna\n"
+              "Usage: bex-wifi-client [OPTION]... RunRxNStart channel bandwidth rate vht\n"
+              "    antenna\n"
               "Starts 802.11n or 802.11ac reception with a packet count, until RunRxStop.\n"
               "\n"
               "Arguments (text reaches the chip's tool as it stands, unchecked):\n"
@@ -71,8 +114,9 @@ TEST(HelpTest, AMethodsHelpReadsLikeThis) {
               "  antenna         the receive chain or chain mask\n"
               "                  as the chip's tool expects\n"
               "\n"
-              "Result (string): \"ok\" or \"failure\", or the packet count at the start, as the "
-              "chip family defines\n");
+              "Result (string): \"ok\" or \"failure\", or the packet count at the start, as the\n"
+              "  chip family defines\n"
+              "Example: bex-wifi-client RunRxNStart 6 20 7 false 1\n");
 }
 
 TEST(HelpTest, TheListHasALineForEachMethod) {
