@@ -37,6 +37,12 @@ class Argument:
         """The numbers among the accepted forms: ["20", "40", "80"]."""
         return re.findall(r"\d+(?:\.\d+)?", self.accepted)
 
+    def choices(self):
+        """All accepted forms where they are a few: ["true", "false"]; else none."""
+        if self.type == "bool":
+            return ["true", "false"]
+        return self.accepted_numbers() if re.fullmatch(r"[\d., ]+or [\d.]+", self.accepted) else []
+
 
 @dataclasses.dataclass(frozen=True)
 class Method:
@@ -46,7 +52,12 @@ class Method:
 
 def methods(explain):
     """The interface's methods, in its order."""
-    listed = json.loads(run(explain, "methods"))["methods"]
+    return read_methods(run(explain, "methods"))
+
+
+def read_methods(listed):
+    """The methods in what the client's `list --json` prints."""
+    listed = json.loads(listed)["methods"]
     return [Method(method["name"], tuple(Argument(**each) for each in method["arguments"]))
             for method in listed]
 
