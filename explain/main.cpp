@@ -3,9 +3,12 @@
 
 // Prints the command lines that calls would run, one a line, without running any:
 //
-//     explain METHOD [ARGUMENT]...   those of one call
-//     explain -                      those of each line of stdin, whose words a tab separates; an
-//                                    empty line ends each answer
+//     explain                        no call: the methods with their arguments' names
+//     explain METHOD [ARGUMENT]...   the lines of one call
+//     explain --quoted METHOD [ARGUMENT]...
+//                                    the same between quotes, since their blanks count
+//     explain -                      those of each call on stdin, one a line, a tab between its
+//                                    words; an empty line ends each answer
 //     explain methods                no call: the interface's methods, as the client lists them
 //     explain family                 no call: the name of the phone's chip family
 //
@@ -30,6 +33,9 @@ using ::android::sp;
 using ::android::base::Split;
 using ::vendor::korvan::bex::wifi::ChipFamily;
 using ::vendor::korvan::bex::wifi::client::Answer;
+using ::vendor::korvan::bex::wifi::client::ArgumentKind;
+using ::vendor::korvan::bex::wifi::client::Command;
+using ::vendor::korvan::bex::wifi::client::commands;
 using ::vendor::korvan::bex::wifi::client::listJson;
 using ::vendor::korvan::bex::wifi::client::phoneFamily;
 using ::vendor::korvan::bex::wifi::client::readRequest;
@@ -61,13 +67,23 @@ void show(const Modules& modules, recorder::RecordedShell& shell) {
     }
 }
 
+void listMethods() {
+    std::cout << "A call is a method and its arguments:\n";
+    for (const Command& command : commands()) {
+        std::cout << "  " << command.name;
+        for (const ArgumentKind* argument : command.arguments) std::cout << ' ' << argument->name;
+        std::cout << '\n';
+    }
+}
+
 enum class Outcome { failed, noCommand, explained };
 
-/** Prints the lines of a call, and forgets them. */
-Outcome explain(IWifiService& service, const Request& request, recorder::RecordedShell& shell) {
+/** Prints the lines of a call, each between two of `quote`, and forgets them. */
+Outcome explain(IWifiService& service, const Request& request, recorder::RecordedShell& shell,
+                const char* quote) {
     const Answer answer = request.command->call(service, request.values);
     const std::vector<std::string> lines = shell.lines();
-    for (const std::string& line : lines) std::cout << line << '\n';
+    for (const std::string& line : lines) std::cout << quote << line << quote << '\n';
     shell.clear();
     if (!answer.delivered) return Outcome::failed;
     return lines.empty() ? Outcome::noCommand : Outcome::explained;
@@ -82,7 +98,7 @@ int explainEachLine(IWifiService& service, recorder::RecordedShell& shell) {
             std::cerr << "explain: line " << number << ": " << problem << '\n';
             return 2;
         }
-        if (explain(service, request, shell) == Outcome::failed) return 1;
+        if (explain(service, request, shell, "") == Outcome::failed) return 1;
         std::cout << '\n';
     }
     return 0;
@@ -91,7 +107,13 @@ int explainEachLine(IWifiService& service, recorder::RecordedShell& shell) {
 } // namespace
 
 int main(int argc, char** argv) {
-    const std::vector<std::string> words(argv + 1, argv + argc);
+    std::vector<std::string> words(argv + 1, argv + argc);
+    const bool quoted = !words.empty() && words[0] == "--quoted";
+    if (quoted) words.erase(words.begin());
+    if (words.empty()) {
+        listMethods();
+        return 0;
+    }
     if (words == std::vector<std::string>{"methods"}) {
         std::cout << listJson();
         return 0;
@@ -99,8 +121,8 @@ int main(int argc, char** argv) {
     const bool family = words == std::vector<std::string>{"family"};
     const bool eachLine = words == std::vector<std::string>{"-"};
     Request request;
-    std::string problem = "usage: explain METHOD [ARGUMENT]...";
-    if (!family && !eachLine && (words.empty() || !readRequest(words, &request, &problem))) {
+    std::string problem;
+    if (!family && !eachLine && !readRequest(words, &request, &problem)) {
         std::cerr << "explain: " << problem << '\n';
         return 2;
     }
@@ -122,7 +144,7 @@ int main(int argc, char** argv) {
     show(modules, shell);
     const sp<IWifiService> service = new implementation::WifiService();
     if (eachLine) return explainEachLine(*service, shell);
-    const Outcome outcome = explain(*service, request, shell);
+    const Outcome outcome = explain(*service, request, shell, quoted ? "\"" : "");
     if (outcome == Outcome::noCommand) std::cerr << "explain: the call runs no command\n";
     return outcome == Outcome::failed ? 1 : 0;
 }

@@ -45,10 +45,17 @@ def test_explain_prints_just_the_lines(dev, phones):
     assert explained.returncode == 0
     assert explained.stderr == ""
     assert explained.stdout == (
-        "wl pkteng_stop tx \n"
-        "ifconfig wlan0 down \n"
-        'echo -n "/etc/firmware/fw_bcmdhd.bin" > /sys/module/bcmdhd/parameters/firmware_path \n')
+        '"wl pkteng_stop tx "\n'
+        '"ifconfig wlan0 down "\n'
+        '"echo -n "/etc/firmware/fw_bcmdhd.bin" > /sys/module/bcmdhd/parameters/firmware_path "\n')
     assert list(phones.iterdir()) == []
+
+
+def test_explain_without_a_method_names_them(dev):
+    named = dev("explain", "broadcom")
+    assert (named.returncode, named.stderr) == (0, "")
+    assert "  RunTxBGStart channel rate power antenna\n" in named.stdout
+    assert "  snifferStop\n" in named.stdout
 
 
 def test_demo(dev, phones):
