@@ -17,6 +17,8 @@ import subprocess
 import sys
 import tempfile
 
+import script
+
 DOCUMENT = pathlib.Path(__file__).resolve().parents[1] / "docs/performance.md"
 MIB = 1024 * 1024
 # Linked into the service besides the generated stubs and the host layer.
@@ -243,7 +245,7 @@ def main():
 
 if __name__ == "__main__":
     try:
-        sys.exit(main())
+        script.run(main)
     except (Failure, OSError, KeyError) as problem:
         print(f"bench: {problem}", file=sys.stderr)
         sys.exit(2)

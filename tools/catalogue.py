@@ -17,6 +17,7 @@ import argument_use
 import code_tables
 import explained
 import method_use_table
+import script
 
 ROOT = pathlib.Path(__file__).resolve().parents[1]
 CATALOGUE = ROOT / "docs" / "commands"
@@ -195,4 +196,4 @@ def main():
 
 
 if __name__ == "__main__":
-    main()
+    script.run(main)

@@ -1,4 +1,4 @@
-#!/usr/bin/python3
+#!/usr/bin/python3 -B
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
 """A client session on a simulated phone that is up: demo.py CHIP PHONE-FOLDER.
@@ -11,6 +11,7 @@ import pathlib
 import subprocess
 import sys
 
+import script
 import servicelog
 
 PHONE = pathlib.Path(__file__).resolve().parents[1] / "simulator" / "phone"
@@ -31,18 +32,39 @@ SESSION = [
 ]
 
 
+# A driver is all module files of a folder. Where an image is for several chips, the ones that do not
+# fit are refused, and the one that fits is enough.
+REFUSED = "FAILED, as it should: the module does not fit this phone"
+
+
+def loads(command):
+    return "insmod " in command.line
+
+
 def show_commands(log):
-    """Prints the commands of a piece of log, each with its outcome and what it printed."""
-    for command in servicelog.commands(log):
-        print(f'  "{command.line}" -> {"ok" if command.succeeded else "FAILED"}')
+    """Prints the commands of a piece of log, each with its outcome and what it printed. Returns how
+    many modules were refused."""
+    commands = list(servicelog.commands(log))
+    loaded = any(loads(command) and command.succeeded for command in commands)
+    refused = 0
+    for command in commands:
+        outcome = "ok" if command.succeeded else "FAILED"
+        if loaded and loads(command) and not command.succeeded:
+            outcome = REFUSED
+            refused += 1
+        print(f'  "{command.line}" -> {outcome}')
         for line in command.printed.splitlines():
             if line:
                 print(f"      printed: {line}")
+    return refused
 
 
 def main():
     chip, phone = sys.argv[1], sys.argv[2]
     log = pathlib.Path(phone) / "log"
+    refused = 0
+    # One who watches through a pipe sees each call when it is made.
+    sys.stdout.reconfigure(line_buffering=True)
     print(f"The simulated {chip} phone is up; its service answers a client in another process.")
     for purpose, call in SESSION:
         print(f"\n{purpose}\n$ bex-wifi-client {' '.join(call)}")
@@ -52,12 +74,15 @@ def main():
             stdout=subprocess.PIPE, text=True, check=False)
         with log.open(encoding="utf-8", errors="replace") as stream:
             stream.seek(seen)
-            show_commands(stream.read())
+            refused += show_commands(stream.read())
         print(f"  result: {client.stdout.rstrip()}")
         if client.returncode != 0:
             sys.exit(f"demo: {call[0]} failed: the client ended with {client.returncode}")
     print("\nEvery call succeeded.")
+    if refused:
+        print(f"{refused} lines FAILED as they should: this phone's image has modules for several "
+              "chips, the\nservice loads them all, and the one that fits is enough.")
 
 
 if __name__ == "__main__":
-    main()
+    script.run(main)

@@ -14,6 +14,7 @@ import subprocess
 import sys
 
 import explained
+import script
 
 NAME = "bex-wifi-client"
 
@@ -123,4 +124,4 @@ def main():
 
 
 if __name__ == "__main__":
-    main()
+    script.run(main)

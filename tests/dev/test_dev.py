@@ -71,6 +71,30 @@ def test_demo(dev, phones):
     assert processes_of(phones) == []
 
 
+def test_demo_tells_why_modules_are_refused(dev):
+    demo = dev("demo", "wcn685x")
+    assert demo.returncode == 0, demo.stderr
+    refused = [line for line in demo.stdout.splitlines() if "-> FAILED" in line]
+    assert len(refused) == 12
+    for line in refused:
+        assert re.fullmatch(r'  "(/vendor/bin/)?insmod .*" -> FAILED, as it should: .*', line)
+    assert "\n12 lines FAILED as they should: this phone's image has modules for" in demo.stdout
+
+
+def test_a_demo_until_ctrl_c(phones):
+    with subprocess.Popen(
+            [ROOT / "dev", "demo", "broadcom"], stdout=subprocess.PIPE, stderr=subprocess.PIPE,
+            text=True, env={**os.environ, "BEX_PHONES": str(phones)},
+            start_new_session=True) as demo:
+        assert demo.stdout.readline().startswith("The simulated broadcom phone is up")
+        os.killpg(demo.pid, signal.SIGINT)
+        complaints = demo.communicate(timeout=60)[1]
+        assert demo.returncode == 130
+    assert "Traceback" not in complaints
+    assert list(phones.iterdir()) == []
+    assert processes_of(phones) == []
+
+
 def test_a_phone_until_ctrl_c(dev, phones):
     # An interactive shell's job: in a group of its own, and Ctrl-C is not ignored.
     with subprocess.Popen(
