@@ -3,12 +3,17 @@
 """One phone as adb's clients see it: accepts their connections and finds the services they ask for."""
 
 import asyncio
+import os
 import re
 import signal
 import socket
+import sys
 
 from adb import shell
 from adb.connection import Connection
+from adb.descriptors import readable
+from launcher import power
+from launcher.errors import PhoneError
 
 MOST_CONNECTIONS = 16
 
@@ -20,7 +25,8 @@ class Device:
         self._folder = folder
         self._listener = listener
         self._connections = set()
-        self._end = asyncio.Event()
+        self._interrupted = asyncio.Event()
+        self._ends = False
 
     def run(self):
         """Returns on SIGTERM, once everything that was started has ended."""
@@ -29,13 +35,32 @@ class Device:
     async def _serve(self):
         loop = asyncio.get_running_loop()
         for number in (signal.SIGINT, signal.SIGTERM):
-            loop.add_signal_handler(number, self._end.set)
+            loop.add_signal_handler(number, self._end)
+        while True:
+            await self._serve_while_on()
+            if self._ends:
+                return
+            # Who connects meanwhile waits in the listener's queue, and is served by a phone that is on.
+            for switch in (power.down, power.up):
+                await _in_child(switch, self._folder)
+
+    async def _serve_while_on(self):
+        """Returns when the phone is to end or to reboot, and nobody is connected any more."""
         accepting = asyncio.create_task(self._accept())
-        await self._end.wait()
+        await self._interrupted.wait()
         accepting.cancel()
         for connection in self._connections:
             connection.cancel()
         await asyncio.gather(accepting, *self._connections, return_exceptions=True)
+        if not self._ends:
+            self._interrupted.clear()
+
+    def _end(self):
+        self._ends = True
+        self._interrupted.set()
+
+    async def _reboot(self, _stream):
+        self._interrupted.set()
 
     async def _accept(self):
         loop = asyncio.get_running_loop()
@@ -62,10 +87,32 @@ class Device:
     def _service(self, name):
         """The coroutine function that serves the service of this name, or None."""
         kind, _, argument = name.partition(b":")
-        words = kind.split(b",")
-        if words[0] in (b"shell", b"exec"):
-            if words[0] == b"exec":
-                words.append(b"raw")
-            command = shell.Command(words[1:], argument)
+        kind, *words = kind.split(b",")
+        if kind in (b"shell", b"exec"):
+            command = shell.Command(words if kind == b"shell" else [b"raw"], argument)
             return lambda stream: shell.run(self._folder, command, stream)
-        return None
+        return {b"root:": _root, b"reboot:": self._reboot}.get(name)
+
+
+async def _root(stream):
+    await stream.write(b"adbd is already running as root\n")
+
+
+async def _in_child(switch, folder):
+    """Switches the phone in a process of its own, which passes nothing of this one on to the phone."""
+    pid = os.fork()
+    if pid == 0:
+        try:
+            signal.set_wakeup_fd(-1)
+            for number in (signal.SIGINT, signal.SIGTERM):
+                signal.signal(number, signal.SIG_DFL)
+            os.closerange(3, os.sysconf("SC_OPEN_MAX"))
+            switch(folder)
+        except (PhoneError, OSError) as error:
+            print(f"phone: {error}", file=sys.stderr, flush=True)
+        finally:
+            os._exit(0)
+    ended = os.pidfd_open(pid)
+    await readable(ended)
+    os.close(ended)
+    os.waitpid(pid, 0)

@@ -18,7 +18,7 @@ import struct
 import subprocess
 import termios
 
-from adb.connection import HungUp
+from adb.descriptors import readable, writable
 from adb.messages import ProtocolError
 from launcher.description import SIMULATOR
 
@@ -102,7 +102,7 @@ class Process:
     async def serve(self, stream):
         """Returns when the command has ended and the peer knows."""
         work = asyncio.gather(*(self._pass_on(descriptor, kind, stream)
-                                for descriptor, kind in self._outputs), _readable(self._ended))
+                                for descriptor, kind in self._outputs), readable(self._ended))
         input_ = asyncio.create_task(self._feed(stream))
         try:
             await asyncio.wait({work, input_}, return_when=asyncio.FIRST_COMPLETED)
@@ -123,7 +123,7 @@ class Process:
         if self._process.poll() is None:
             self._process.send_signal(signal.SIGHUP)
             try:
-                await asyncio.wait_for(_readable(self._ended), HANG_UP_SECONDS)
+                await asyncio.wait_for(readable(self._ended), HANG_UP_SECONDS)
             except asyncio.TimeoutError:
                 self._process.kill()
         self._process.wait()
@@ -137,7 +137,7 @@ class Process:
     async def _pass_on(self, descriptor, kind, stream):
         """Copies what the command prints, until its end."""
         while True:
-            await _readable(descriptor)
+            await readable(descriptor)
             try:
                 data = os.read(descriptor, LONGEST_READ)
             except OSError as error:  # a terminal that nobody has open any more
@@ -170,7 +170,7 @@ class Process:
 
     async def _write(self, data):
         while data and self._stdin is not None:
-            await _writable(self._stdin)
+            await writable(self._stdin)
             try:
                 data = data[os.write(self._stdin, data):]
             except BlockingIOError:
@@ -206,22 +206,3 @@ def _streams(command):
         return write_in, [(read_out, STDOUT)], (read_in, write_out, write_out)
     read_err, write_err = os.pipe()
     return write_in, [(read_out, STDOUT), (read_err, STDERR)], (read_in, write_out, write_err)
-
-
-async def _readable(descriptor):
-    loop = asyncio.get_running_loop()
-    await _once(descriptor, loop.add_reader, loop.remove_reader)
-
-
-async def _writable(descriptor):
-    loop = asyncio.get_running_loop()
-    await _once(descriptor, loop.add_writer, loop.remove_writer)
-
-
-async def _once(descriptor, add, remove):
-    ready = asyncio.get_running_loop().create_future()
-    add(descriptor, lambda: ready.done() or ready.set_result(None))
-    try:
-        await ready
-    finally:
-        remove(descriptor)

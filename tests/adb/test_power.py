@@ -31,6 +31,7 @@ def shared_fixture(adb):
 def off_phone_fixture(shared):
     yield shared
     launcher("down", shared.folder)
+    shared.forget()
 
 
 def port_of(serial):
@@ -76,6 +77,36 @@ def test_adb_outlives_the_service(phone):
     assert phone.shell("bex-wifi-client isSnifferMode")[0] == 3
     assert launcher("up", phone.folder).returncode == 0
     assert phone.shell("bex-wifi-client isSnifferMode") == (0, b"false\n", b"")
+
+
+def test_a_reboot_is_a_power_cycle(phone):
+    phone.up()
+    phone.shell("setprop vendor.test 1")
+    assert phone.shell("getprop vendor.test") == (0, b"1\n", b"")
+    with phone.adb.start("-s", phone.serial, "shell", "echo started; sleep 1000",
+                         stdout=subprocess.PIPE) as client:
+        assert client.stdout.readline() == b"started\n"
+        assert phone.do("reboot").returncode == 0
+        client.wait(TIMEOUT)
+
+    def connected():
+        return phone.connect() == f"connected to {phone.serial}\n"
+
+    wait_for(connected)
+    assert phone.shell("getprop vendor.test") == (0, b"\n", b"")
+    assert phone.shell("bex-wifi-client isSnifferMode") == (0, b"false\n", b"")
+    assert (phone.folder / "adb.log").read_text() == ""
+
+
+def test_it_is_root_already(phone):
+    phone.up()
+    assert phone.do("root").stdout == b"adbd is already running as root\n"
+
+
+def test_there_is_nothing_else_to_boot_into(phone):
+    phone.up()
+    assert phone.do("reboot", "bootloader").returncode != 0
+    assert phone.shell("echo here") == (0, b"here\n", b"")
 
 
 def test_down_ends_what_adb_s_clients_run(phone):

@@ -50,11 +50,21 @@ class AdbPhone(Phone):
         up = subprocess.run([PHONE, "up", self.folder, "--adb"], check=True, timeout=TIMEOUT,
                             stdout=subprocess.PIPE, text=True)
         self.serial = up.stdout.strip()
-        self.connect()
+        assert self.connect() == f"connected to {self.serial}\n"
 
     def connect(self):
-        connected = self.adb("connect", self.serial)
-        assert connected.stdout == f"connected to {self.serial}\n".encode(), connected
+        """What adb says to it."""
+        self.forget()
+        return self.adb("connect", self.serial).stdout.decode()
+
+    def forget(self):
+        """Keeps the server from trying a phone that has gone."""
+        if self.serial:
+            self.adb("disconnect", self.serial)
+
+    def down(self):
+        super().down()
+        self.forget()
 
     def do(self, *arguments, **options):
         """An adb command on this phone."""
