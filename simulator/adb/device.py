@@ -14,6 +14,7 @@ from adb.connection import Connection
 from adb.descriptors import readable
 from launcher import power
 from launcher.errors import PhoneError
+from launcher.inside import Folder
 
 MOST_CONNECTIONS = 16
 
@@ -30,6 +31,7 @@ class Device:
 
     def run(self):
         """Returns on SIGTERM, once everything that was started has ended."""
+        _show_log(self._folder)
         asyncio.run(self._serve())
 
     async def _serve(self):
@@ -92,6 +94,14 @@ class Device:
             command = shell.Command(words if kind == b"shell" else [b"raw"], argument)
             return lambda stream: shell.run(self._folder, command, stream)
         return {b"root:": _root, b"reboot:": self._reboot}.get(name)
+
+
+def _show_log(folder):
+    """Gives the phone's log a name inside, for logcat. Every boot goes on in the same file."""
+    os.close(os.open(f"{folder}/log", os.O_WRONLY | os.O_CREAT | os.O_APPEND, 0o644))
+    inside = Folder(folder, "root/phone")
+    inside.remove("log")
+    os.link(f"{folder}/log", "log", dst_dir_fd=inside.fd)
 
 
 async def _root(stream):

@@ -20,7 +20,7 @@ SIMULATOR = os.path.dirname(os.path.dirname(os.path.realpath(__file__)))
 
 NAME = re.compile(r"[A-Za-z0-9_-]+")
 PROPERTY = re.compile(r"[A-Za-z0-9_:@-]+(\.[A-Za-z0-9_:@-]+)*")
-ALL_PHONES = ["getprop", "setprop"]
+ALL_PHONES = ["getprop", "logcat", "setprop"]
 
 
 class Description:
