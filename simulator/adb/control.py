@@ -94,6 +94,7 @@ def _become(folder, listener, ready):
         from adb.device import Device  # slow to load, and only this process needs it
 
         os.setsid()
+        os.chdir("/")
         log = os.open(f"{folder}/adb.log", os.O_WRONLY | os.O_CREAT | os.O_TRUNC, 0o644)
         nothing = os.open(os.devnull, os.O_RDWR)
         for number, descriptor in enumerate((nothing, nothing, log)):

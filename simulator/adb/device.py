@@ -9,7 +9,7 @@ import signal
 import socket
 import sys
 
-from adb import shell
+from adb import shell, sync
 from adb.connection import Connection
 from adb.descriptors import readable
 from launcher import power
@@ -84,7 +84,7 @@ class Device:
         with open(f"{self._folder}/chip", encoding="utf-8") as record:
             chip = re.sub(r"[^\w.-]", "_", record.read().strip(), flags=re.ASCII)
         return (f"device::ro.product.name=simulated;ro.product.model={chip};"
-                f"ro.product.device={chip};features=shell_v2").encode()
+                f"ro.product.device={chip};features=shell_v2,stat_v2,fixed_push_mkdir").encode()
 
     def _service(self, name):
         """The coroutine function that serves the service of this name, or None."""
@@ -93,7 +93,10 @@ class Device:
         if kind in (b"shell", b"exec"):
             command = shell.Command(words if kind == b"shell" else [b"raw"], argument)
             return lambda stream: shell.run(self._folder, command, stream)
-        return {b"root:": _root, b"reboot:": self._reboot}.get(name)
+        return {b"root:": _root, b"reboot:": self._reboot, b"sync:": self._sync}.get(name)
+
+    async def _sync(self, stream):
+        await sync.serve(f"{self._folder}/root", stream)
 
 
 def _show_log(folder):

@@ -9,59 +9,11 @@ import struct
 
 import pytest
 
-from support.adb import TIMEOUT, processes_of
+from support.adb import processes_of
+from support.adbpeer import GREETING, Peer, message
 from support.waiting import wait_for
 
-GREETING = (b"CNXN", 0x01000001, 1 << 20, b"host::\0")
 SLEEP = b"shell,v2,raw:trap '' HUP; sleep 1000\0"
-
-
-def message(name, first, second, data=b"", length=None, magic=None):
-    command = int.from_bytes(name, "little")
-    return struct.pack("<6I", command, first, second, len(data) if length is None else length,
-                       0, command ^ 0xffffffff if magic is None else magic) + data
-
-
-class Peer(socket.socket):
-    """A connection to the phone."""
-
-    def __init__(self, phone):
-        super().__init__()
-        self.settimeout(TIMEOUT)
-        host, port = phone.serial.split(":")
-        self.connect((host, int(port)))
-
-    def greet(self):
-        self.sendall(message(*GREETING))
-        assert self.answer()[:2] == (b"CNXN", 0x01000001)
-        return self
-
-    def exactly(self, count):
-        data = b""
-        while len(data) < count:
-            piece = self.recv(count - len(data))
-            if not piece:
-                raise EOFError
-            data += piece
-        return data
-
-    def answer(self):
-        """(command, first argument, second argument, data). Raises EOFError at the end."""
-        name, first, second, length = struct.unpack("<4s3I8x", self.exactly(24))
-        return name, first, second, self.exactly(length)
-
-    def open(self, service, number=1):
-        """The phone's number for the new stream."""
-        self.sendall(message(b"OPEN", number, 0, service))
-        name, local, remote, _ = self.answer()
-        assert (name, remote) == (b"OKAY", number)
-        return local
-
-    def is_cut(self):
-        with contextlib.suppress(EOFError, ConnectionResetError):
-            while True:
-                self.answer()
-        return True
 
 
 @pytest.fixture(name="peer")
@@ -153,7 +105,7 @@ def test_the_streams_and_connections_of_a_peer_are_limited(phone, peer):
     count = 0
     while True:
         count += 1
-        peer.sendall(message(b"OPEN", count, 0, b"shell,v2,raw:cat\0"))
+        peer.sendall(message(b"OPEN", count, 0, b"sync:\0"))
         if peer.answer()[0] == b"CLSE":
             break
     assert 16 <= count <= 100
