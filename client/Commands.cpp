@@ -4,6 +4,7 @@
 #include "client/Commands.h"
 
 #include <android-base/strings.h>
+#include <unistd.h>
 
 #include <algorithm>
 #include <cctype>
@@ -207,6 +208,14 @@ std::string wrongCount(const Command& command, size_t given) {
            std::to_string(given);
 }
 
+/** The kernel takes 32 pages for one argument of a program, such as the shell's, with its NUL. */
+size_t longestCommandLine() {
+    return 32 * static_cast<size_t>(getpagesize()) - 1;
+}
+
+// A command of one letter, and the blanks after it and after the argument.
+constexpr size_t kLeastBesideArgument = 3;
+
 } // namespace
 
 bool Command::tellsFailure(const Answer& answer) const {
@@ -273,6 +282,11 @@ bool readRequest(const std::vector<std::string>& words, Request* request, std::s
                 return false;
             }
             value.flag = *flag;
+        } else if (value.text.size() > longestCommandLine() - kLeastBesideArgument) {
+            *problem = std::string(command->arguments[i]->name) + " has " +
+                       std::to_string(value.text.size()) + " bytes: a command line may have " +
+                       std::to_string(longestCommandLine()) + ", so none with it can run";
+            return false;
         }
         request->values.push_back(value);
     }

@@ -107,7 +107,8 @@ std::string unknownCommand(const std::string& name);
 
 /**
  * Reads a method's name and its arguments. Booleans are "true", "false", "1" or "0"; every other
- * argument is taken as it stands, the empty one and one that is not UTF-8 included.
+ * argument is taken as it stands, the empty one and one that is not UTF-8 included, unless it is
+ * too long for any command line.
  *
  * @param words The name, then the arguments in the interface's order.
  * @param problem On failure one line (without a newline) that tells what is wrong.

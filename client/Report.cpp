@@ -52,6 +52,12 @@ std::string channelOf(const Request& request) {
     return "";
 }
 
+/** What the host's transport says of a service that has no room for one more client. */
+bool wasRefused(const Outcome& outcome) {
+    return outcome.ending == Ending::transportFailed &&
+           outcome.answer.transportError.find("'WOULD_BLOCK: '") != std::string::npos;
+}
+
 Report judgeAnswer(const Request& request, const Outcome& outcome) {
     if (outcome.ending != Ending::answered) return judgeUnanswered(request.command->name, outcome);
     if (!request.command->tellsFailure(outcome.answer)) return {};
@@ -71,6 +77,11 @@ Report judgeUnanswered(const std::string& doing, const Outcome& outcome) {
                     "vendor.korvan.bex.wifi@1.0-service running, is it in the VINTF manifest, and "
                     "may this user find it?"};
         case Ending::transportFailed:
+            if (wasRefused(outcome)) {
+                return {kTransportFailed,
+                        "vendor.korvan.bex.wifi@1.0-service has too many clients and took no call "
+                        "from this one; see which processes hold its sockets: ss -xp"};
+            }
             return {kTransportFailed,
                     doing + " failed in the transport, the service may have died: see its log; " +
                             jsonString(outcome.answer.transportError)};
@@ -78,7 +89,7 @@ Report judgeUnanswered(const std::string& doing, const Outcome& outcome) {
             if (outcome.stage == Stage::lookup) {
                 return {kTooLate,
                         "vendor.korvan.bex.wifi@1.0-service has not answered in time: it may be "
-                        "busy with other calls or not running"};
+                        "busy with other calls or not running; nothing was called"};
             }
             return {kTooLate, "the deadline passed in " + doing +
                                       ": the service's commands may still be running"};
@@ -93,7 +104,8 @@ Report judgeUnanswered(const std::string& doing, const Outcome& outcome) {
 }
 
 bool mayHaveStarted(const Request& request, const Outcome& outcome) {
-    return *request.command->starts != '\0' && outcome.stage != Stage::lookup;
+    return *request.command->starts != '\0' && outcome.stage != Stage::lookup &&
+           !wasRefused(outcome);
 }
 
 std::string stopCommandLine(const std::string& channel) {

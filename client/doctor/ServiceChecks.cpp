@@ -209,7 +209,8 @@ Check ServiceExamination::answering() {
     }
     if (!error) {
         return problem(name, "the service is there and has not answered" + mInTime,
-                       std::string("both its threads may be in calls, or it hangs: logcat | grep "
+                       std::string("both its threads may be in calls, or wait for ever for a tool "
+                                   "that left a process behind with its output open: logcat | grep "
                                    "wifi@1.0- shows its last command; then stop ") +
                                kInitService + "; start " + kInitService +
                                "; a station gives every call --timeout, and every adb a deadline "

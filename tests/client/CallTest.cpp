@@ -49,7 +49,7 @@ TEST_F(CallTest, AnswersWithinTheDeadline) {
 }
 
 TEST_F(CallTest, AFailedTransportIsNoAnswer) {
-    mService->broken = true;
+    mService->broken = ::android::DEAD_OBJECT;
     const Outcome outcome = callService(mRequest, find(), std::nullopt, kNoProgress);
     EXPECT_EQ(outcome.ending, Ending::transportFailed);
     EXPECT_FALSE(outcome.answer.delivered);

@@ -3,6 +3,7 @@
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <unistd.h>
 
 #include <algorithm>
 #include <future>
@@ -199,7 +200,7 @@ TEST_F(ClientTest, ExitCode3WhenThereIsNoService) {
 }
 
 TEST_F(ClientTest, ExitCode4WhenTheTransportFails) {
-    mService->broken = true;
+    mService->broken = ::android::DEAD_OBJECT;
     for (const Words& arguments :
          {Words{"RunTxStop", "6"}, Words{"isMimoSupport"}, Words{"RunRxStop", "6"}}) {
         mErr.str("");
@@ -208,6 +209,31 @@ TEST_F(ClientTest, ExitCode4WhenTheTransportFails) {
         EXPECT_THAT(err(), IsOneLineWith(arguments[0] + " failed in the transport, the service "
                                                         "may have died: see its log; \""));
         EXPECT_THAT(err(), HasSubstr("DEAD_OBJECT"));
+    }
+}
+
+TEST_F(ClientTest, ExitCode2WhenNoCommandLineCanHoldAnArgument) {
+    // The longest with one letter before it, the blanks after both, and the NUL.
+    const size_t longest = 32 * static_cast<size_t>(getpagesize()) - 4;
+    EXPECT_EQ(run({"RunTxStop", std::string(longest, '6')}), 0);
+    EXPECT_EQ(run({"RunTxStop", std::string(longest + 1, '6')}), 2);
+    EXPECT_EQ(mService->calls.size(), 1u);
+    EXPECT_EQ(err(), "bex-wifi-client: channel has " + std::to_string(longest + 1) +
+                             " bytes: a command line may have " +
+                             std::to_string(32 * getpagesize() - 1) +
+                             ", so none with it can run; see bex-wifi-client RunTxStop --help\n");
+}
+
+TEST_F(ClientTest, ExitCode4WhenTheServiceHasTooManyClients) {
+    mService->broken = ::android::WOULD_BLOCK;
+    for (const Words& arguments :
+         {Words{"RunTxBGStart", "6", "11", "20", "1"}, Words{"RunRxStop", "6"}}) {
+        mErr.str("");
+        EXPECT_EQ(run(arguments), 4);
+        EXPECT_EQ(out(), "");
+        EXPECT_EQ(err(),
+                  "bex-wifi-client: vendor.korvan.bex.wifi@1.0-service has too many clients and "
+                  "took no call from this one; see which processes hold its sockets: ss -xp\n");
     }
 }
 
@@ -227,8 +253,7 @@ TEST_F(ClientDeadlineTest, ExitCode5InTheSearch) {
     EXPECT_EQ(out(), "");
     EXPECT_EQ(err(),
               "bex-wifi-client: vendor.korvan.bex.wifi@1.0-service has not answered in time: it "
-              "may "
-              "be busy with other calls or not running\n");
+              "may be busy with other calls or not running; nothing was called\n");
 }
 
 TEST_F(ClientDeadlineTest, ExitCode5InTheCall) {
@@ -305,7 +330,7 @@ TEST_F(ClientTest, JsonWithoutAService) {
 }
 
 TEST_F(ClientTest, JsonOfAFailedTransport) {
-    mService->broken = true;
+    mService->broken = ::android::DEAD_OBJECT;
     EXPECT_EQ(run({"--json", "RunRxStop", "6"}), 4);
     EXPECT_THAT(withoutCourse(out()),
                 AllOf(StartsWith(

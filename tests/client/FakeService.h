@@ -22,8 +22,8 @@ class FakeService : public V1_0::IWifiService {
     int32_t number = 0;
     bool flag = false;
     std::string text;
-    /** The transaction fails after the call was noted. */
-    bool broken = false;
+    /** How the transaction fails after the call was noted. */
+    ::android::status_t broken = ::android::OK;
     /** A method with a text leaves its callback alone. */
     bool silent = false;
     /** A method with a text calls its callback twice. */
@@ -104,24 +104,18 @@ class FakeService : public V1_0::IWifiService {
         return std::string(argument.c_str(), argument.size());
     }
 
-    // What the platform makes of a service that died in the call.
-    static ::android::hardware::Status deadObject() {
-        using ::android::hardware::Status;
-        return Status::fromExceptionCode(Status::EX_TRANSACTION_FAILED, "DEAD_OBJECT: ");
-    }
-
     template <typename T>
     Return<T> answer(Words call, const T& value) {
         calls.push_back(std::move(call));
         onCall();
-        if (broken) return deadObject();
+        if (broken != ::android::OK) return ::android::hardware::Status::fromStatusT(broken);
         return value;
     }
 
     Return<void> answerText(Words call, const std::function<void(const hidl_string&)>& keep) {
         calls.push_back(std::move(call));
         onCall();
-        if (broken) return deadObject();
+        if (broken != ::android::OK) return ::android::hardware::Status::fromStatusT(broken);
         if (!silent) keep(text);
         if (doubled) keep(text);
         return ::android::hardware::Void();

@@ -133,6 +133,8 @@ TEST_F(ServiceChecksTest, ASearchThatDoesNotEnd) {
     const Checks checks = all();
     expect(checks[7], Verdict::unknown, "the search has not ended", "\"answering\"");
     expect(checks[8], Verdict::problem, "has not answered in 1 s", "--timeout");
+    expect(checks[8], Verdict::problem, "has not answered",
+           "a tool that left a process behind with its output open");
     EXPECT_EQ(countProblems(checks), 1U);
 }
 
