@@ -28,7 +28,7 @@ def version():
 
 def confine(paths):
     """From now on this process changes no file but those in `paths` and below, opens no TCP
-    connection, and reaches no process and no abstract socket outside; as far as the kernel has it."""
+    connection, and reaches no process and no abstract socket outside, as far as the kernel can."""
     has = version()
     if has < 2:  # the first one refuses each move to another folder
         return

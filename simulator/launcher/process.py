@@ -16,6 +16,7 @@ import ctypes
 import os
 import select
 import signal
+import termios
 
 from launcher import landlock
 from launcher.errors import PhoneError
@@ -34,6 +35,7 @@ def run(kind, folder, command, streams=()):
     """The exit code of a command that runs inside a phone, 128 + n for signal n. `streams` replace
     the standard streams, standard input first."""
     sandbox = Sandbox(kind, folder, command, streams)
+    terminal = _Terminal()
     launcher = os.getpid()
     block_signals()
     holder = os.fork()
@@ -45,7 +47,9 @@ def run(kind, folder, command, streams=()):
     unblock_signals()
     os.waitid(os.P_PID, holder, os.WEXITED | os.WNOWAIT)
     block_signals()  # nothing is passed on once the next line has freed the holder's number
-    return _code(os.waitpid(holder, 0)[1])
+    status = os.waitpid(holder, 0)[1]
+    terminal.restore()
+    return _code(status)
 
 
 def _hold(launcher, sandbox):
@@ -77,6 +81,23 @@ def choose(folder):
         except PhoneError as error:
             refusals.append(str(error))
     raise PhoneError("no sandbox: " + "; ".join(refusals))
+
+
+class _Terminal:
+    """The modes of the terminal that the command gets, if it gets one: it may change them, and be
+    killed before it can change them back."""
+
+    def __init__(self):
+        self.stream = next((stream for stream in range(3) if os.isatty(stream)), None)
+        self.modes = None if self.stream is None else termios.tcgetattr(self.stream)
+
+    def restore(self):
+        """Unless the terminal has gone, or is another job's by now."""
+        try:
+            if self.modes and os.tcgetpgrp(self.stream) == os.getpgrp():
+                termios.tcsetattr(self.stream, termios.TCSANOW, self.modes)
+        except (OSError, termios.error):
+            pass
 
 
 class Sandbox:

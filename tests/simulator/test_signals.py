@@ -107,6 +107,16 @@ def test_what_runs_inside_has_no_terminal_to_type_into(any_new_phone):
             assert str(launcher.pid) not in (group, session)
 
 
+@pytest.mark.parametrize("end", ["exit 0", "kill -9 0", "read word"])
+def test_the_terminal_is_left_as_it_was(any_new_phone, end):
+    with at_terminal(any_new_phone, f"busybox stty raw; echo ready; {end}") as (launcher, terminal):
+        await_word(terminal, "ready")
+        if end.startswith("read"):
+            launcher.terminate()
+        launcher.wait(60)
+        assert termios.tcgetattr(terminal)[3] & termios.ICANON
+
+
 @pytest.mark.parametrize("name, key", [("INT", b"\x03"), ("QUIT", b"\x1c")])
 def test_a_key_reaches_the_command(any_new_phone, name, key):
     if name == "QUIT" and any_new_phone.launcher.kind == "proot":
