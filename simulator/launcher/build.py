@@ -6,6 +6,7 @@ Links inside the root are relative, so that following one from outside stays ins
 the simulation itself is below /phone, which no real phone has.
 """
 
+import errno
 import os
 import shutil
 import stat
@@ -112,8 +113,10 @@ class Builder:
             try:
                 os.mknod(path, stat.S_IFCHR | 0o666, os.makedev(major, minor))
                 os.chmod(path, 0o666)
-                os.close(os.open(path, os.O_RDWR))
-            except OSError:
+                os.close(os.open(path, os.O_RDWR | os.O_NOCTTY))
+            except OSError as error:
+                if error.errno == errno.ENXIO:  # /dev/tty, when this process has no terminal
+                    continue
                 if os.path.lexists(path):
                     os.remove(path)
                 self._text(f"/dev/{name}", "")

@@ -44,6 +44,14 @@ def test_installs_a_binary_with_its_libraries(launcher, place, standin):
     assert result.stderr == "standin: No such file or directory\n"  # it ran; nobody listens
 
 
+def test_its_devices_are_its_own_or_none_is(launcher, place):
+    """/dev/tty, too, which cannot be opened without a controlling terminal."""
+    made = launcher("create", "broadcom", place / "phone", start_new_session=True)
+    assert made.returncode == 0, made.stderr
+    devices = [path for path in (place / "phone/root/dev").iterdir() if path.name != "socket"]
+    assert len({path.is_char_device() for path in devices}) == 1
+
+
 def test_installs_any_other_file_as_it_is(launcher, place):
     text = place / "text"
     text.write_text("manifest\n")
