@@ -62,6 +62,8 @@ bool readCommandLine(const std::vector<std::string>& arguments, CommandLine* lin
             line->version = true;
         } else if (*argument == "--require-count") {
             line->requireCount = true;
+        } else if (*argument == "--strict") {
+            line->strict = true;
         } else if (StartsWith(*argument, kTimeoutEquals)) {
             if (!readTimeout(argument->substr(strlen(kTimeoutEquals)), line, problem)) return false;
         } else if (*argument == kTimeout) {

@@ -18,13 +18,15 @@ struct CommandLine {
     bool version = false;
     bool json = false;
     bool requireCount = false;
+    bool strict = false;
     std::optional<std::chrono::nanoseconds> timeout;
     /** The subcommand and its arguments, byte for byte. */
     std::vector<std::string> words;
 };
 
 /**
- * Reads the options --help (-h), --version, --json, --require-count, --timeout SECONDS and
+ * Reads the options --help (-h), --version, --json, --require-count, --strict, --timeout SECONDS
+ * and
  * --timeout=SECONDS. "--" ends the options.
  * "-" and negative decimal numbers such as "-20" and "-0.5" are words; anything else that begins
  * with "-" is an option. SECONDS is a decimal number, such as 2.5, above 0 and up to a million.

@@ -3,6 +3,8 @@
 
 #include "client/Client.h"
 
+#include <android-base/strings.h>
+
 #include <cerrno>
 #include <cstring>
 
@@ -173,6 +175,13 @@ int call(const CommandLine& line, const Surroundings& to) {
     if (line.requireCount && !request.command->result->counts) {
         return wrongUsage(to, std::string(request.command->name) + " has no count to require",
                           request.command->name);
+    }
+    const std::vector<std::string> warnings = warningsOf(request);
+    if (line.strict && !warnings.empty()) {
+        return wrongUsage(to, warnings[0], request.command->name);
+    }
+    if (!line.json && !warnings.empty()) {
+        fail(to, kSuccess, "warning: " + ::android::base::Join(warnings, "; "));
     }
     const Outcome outcome = callWatched(request, line, to);
     Report report = judge(request, outcome);

@@ -3,11 +3,13 @@
 
 #include "client/Commands.h"
 
+#include <android-base/parseint.h>
 #include <android-base/strings.h>
 #include <unistd.h>
 
 #include <algorithm>
 #include <cctype>
+#include <initializer_list>
 #include <numeric>
 #include <optional>
 
@@ -20,15 +22,47 @@ namespace {
 constexpr auto kText = ArgumentKind::Type::text;
 constexpr auto kBoolean = ArgumentKind::Type::boolean;
 
+bool isOneOf(std::initializer_list<const char*> texts, const std::string& text) {
+    return std::find(texts.begin(), texts.end(), text) != texts.end();
+}
+
+/** Whether it is a number in plain decimal, such as "7", in this range. */
+bool isNumber(const std::string& text, int lowest, int highest) {
+    int number = 0;
+    return ::android::base::ParseInt(text, &number, lowest, highest) &&
+           text == std::to_string(number);
+}
+
+bool isChannel(const std::string& text) {
+    return isNumber(text, 1, 14) || isNumber(text, 36, 177);
+}
+
+bool isNarrowBandwidth(const std::string& text) {
+    return isOneOf({"20", "40", "80"}, text);
+}
+
+bool isBandwidth(const std::string& text) {
+    return isNarrowBandwidth(text) || text == "160";
+}
+
+bool isRate(const std::string& text) {
+    return isOneOf({"1", "2", "5.5", "6", "9", "11", "12", "18", "24", "36", "48", "54"}, text);
+}
+
+bool isMcs(const std::string& text) {
+    return isNumber(text, 0, 15);
+}
+
 // clang-format off
 constexpr ArgumentKind
     kChannel{"channel", kText, "the IEEE 802.11 channel number", "",
-             "decimal: 1 to 14 (2.4 GHz), 36 and up (5 GHz)", "6"},
-    kBandwidth{"bandwidth", kText, "the channel width", "MHz", "20, 40, 80 or 160", "20"},
-    kNarrowBandwidth{"bandwidth", kText, "the channel width", "MHz", "20, 40 or 80", "20"},
+             "decimal: 1 to 14 (2.4 GHz), 36 and up (5 GHz)", "6", isChannel},
+    kBandwidth{"bandwidth", kText, "the channel width", "MHz", "20, 40, 80 or 160", "20", isBandwidth},
+    kNarrowBandwidth{"bandwidth", kText, "the channel width", "MHz", "20, 40 or 80", "20",
+                     isNarrowBandwidth},
     kRate{"rate", kText, "the data rate", "Mbit/s",
-          "1, 2, 5.5, 6, 9, 11, 12, 18, 24, 36, 48 or 54", "54"},
-    kMcs{"rate", kText, "the MCS index", "", "decimal, such as 0 or 7", "7"},
+          "1, 2, 5.5, 6, 9, 11, 12, 18, 24, 36, 48 or 54", "54", isRate},
+    kMcs{"rate", kText, "the MCS index", "", "decimal, such as 0 or 7", "7", isMcs},
     kPower{"power", kText, "the transmit power", "that of the chip's tool",
            "as the chip's tool expects", "15"},
     kVht{"vht", kBoolean, "802.11ac (VHT) rates when true, 802.11n (HT) rates when false", "",
@@ -41,7 +75,8 @@ constexpr ArgumentKind
                "as the chip's tool expects", "1"},
     kSsid{"ssid", kText, "the network name of the open access point", "",
           "any text; a name with blanks becomes several words", "test-ap"},
-    kAddress{"address", kText, "the IPv4 address to give to the interface", "", "dotted decimal", "192.168.1.7"};
+    kAddress{"address", kText, "the IPv4 address to give to the interface", "", "dotted decimal",
+             "192.168.1.7"};
 
 constexpr char kCommandLog[] =
     "which command failed is in the service's log (logcat, tags that begin with \"wifi@1.0-\")";
@@ -229,6 +264,22 @@ std::optional<std::string> packetCount(const std::string& answer) {
         return std::nullopt;
     }
     return number.erase(0, std::min(number.find_first_not_of('0'), number.size() - 1));
+}
+
+std::vector<std::string> warningsOf(const Request& request) {
+    std::vector<std::string> warnings;
+    for (size_t i = 0; i < request.values.size(); ++i) {
+        const ArgumentKind& kind = *request.command->arguments[i];
+        const std::string& text = request.values[i].text;
+        if (text.empty()) {
+            warnings.push_back(std::string(kind.name) +
+                               " is empty: on most chips the command line ends there");
+        } else if (kind.isKnown != nullptr && !kind.isKnown(text)) {
+            warnings.push_back(std::string(kind.name) + " " + jsonString(text) +
+                               " is none that a chip knows (" + kind.accepted + ")");
+        }
+    }
+    return warnings;
 }
 
 const std::vector<Command>& commands() {

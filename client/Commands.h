@@ -33,6 +33,8 @@ struct ArgumentKind {
     const char* accepted;
     /** One of them. */
     const char* example;
+    /** Whether some chip makes sense of a text; null where nobody but the chip's tool can tell. */
+    bool (*isKnown)(const std::string& text) = nullptr;
 };
 
 /** What a method answers. */
@@ -95,6 +97,9 @@ struct Request {
     const Command* command = nullptr;
     std::vector<Value> values;
 };
+
+/** A line for each value that no chip makes sense of. It goes to the service all the same. */
+std::vector<std::string> warningsOf(const Request& request);
 
 /** The sixteen methods in the interface's order. */
 const std::vector<Command>& commands();

@@ -31,6 +31,8 @@ Options, before or after the method:
                      and may take its time. The doctor gives up after 5 seconds
                      without it, stop after 60
   --require-count    end with 7 when the answer holds no count of packets
+  --strict           end with 2, before the call, when a value is none that a
+                     chip knows; without it that is a warning
   --                 end of the options; needed before an argument that begins
                      with "-", unless it is a number
   --help, -h         explain

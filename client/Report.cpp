@@ -177,6 +177,12 @@ std::string jsonReport(const Request& request, const Outcome& outcome, const Rep
         object.add("count", packetCount(outcome.answer.text).value_or("null"));
     }
     const bool started = mayHaveStarted(request, outcome);
+    const std::vector<std::string> warnings = warningsOf(request);
+    if (!warnings.empty()) {
+        JsonArray array;
+        for (const std::string& warning : warnings) array.add(jsonString(warning));
+        object.add("warnings", array.str());
+    }
     addCourse(outcome, started ? std::optional<bool>(true) : std::nullopt, &object);
     return withEnding(object, report);
 }

@@ -95,8 +95,8 @@ TEST_F(ClientTest, AStartThatFailedSaysWhatMayBeOnAndWhatEndsIt) {
 TEST_F(ClientTest, WhatEndsAStartIsACommandLineToCopyWhateverTheChannel) {
     mService->number = -1;
     EXPECT_EQ(run({"snifferStart", "6; reboot", "20"}), 1);
-    EXPECT_THAT(err(), IsOneLineWith("; monitor mode may be on, what ends it is: bex-wifi-client "
-                                     "stop\n"));
+    EXPECT_THAT(err(), ::testing::EndsWith("; monitor mode may be on, what ends it is: "
+                                           "bex-wifi-client stop\n"));
 }
 
 TEST_F(ClientTest, WhatStartsNothingLeavesNothingOn) {
@@ -287,12 +287,12 @@ TEST_F(ClientTest, JsonOfSuccess) {
 
 TEST_F(ClientTest, JsonNamesEveryArgumentAndWritesFlagsAsFlags) {
     mService->text = "ok";
-    EXPECT_EQ(run({"--json", "RunRxNStart", "6", "20", "a\"\n\xFF", "1", ""}), 0);
+    EXPECT_EQ(run({"--json", "RunRxNStart", "6", "20", "7", "1", "a\"\n\xFF"}), 0);
     EXPECT_EQ(withoutCourse(out()),
               R"({"schema_version":1,"method":"RunRxNStart","arguments":{"channel":"6",)"
-              R"("bandwidth":"20","rate":"a\"\n)"
+              R"("bandwidth":"20","rate":"7","vht":true,"antenna":"a\"\n)"
               "\uFFFD"
-              R"(","vht":true,"antenna":""},"ok":true,"arguments_hex":{"rate":"61220aff"},)"
+              R"("},"ok":true,"arguments_hex":{"antenna":"61220aff"},)"
               R"("value":"ok","count":null,COURSE,"exit_code":0})"
               "\n");
 }
@@ -402,6 +402,32 @@ TEST_F(ClientTest, JsonTellsHowFarTheCallCameAndWhatMayBeOn) {
                 StartsWith(R"("radio_may_be_on":null,"stage":"lookup",)"));
     EXPECT_THAT(members({"--json", "stop"}),
                 StartsWith(R"("radio_may_be_on":true,"stage":"lookup",)"));
+}
+
+TEST_F(ClientTest, AValueThatNoChipKnowsIsAWarningAndTheCallIsMade) {
+    const Words call = {"RunRxBgStart", "999", "13", ""};
+    mService->text = "ok";
+    EXPECT_EQ(run(call), 0);
+    EXPECT_EQ(out(), "ok\n");
+    EXPECT_THAT(err(), IsOneLineWith("warning: channel \"999\" is none that a chip knows (decimal: "
+                                     "1 to 14 (2.4 GHz), 36 and up (5 GHz)); "));
+    EXPECT_THAT(err(), AllOf(HasSubstr("; rate \"13\" is none"), HasSubstr("; antenna is empty")));
+    EXPECT_THAT(mService->calls, ElementsAre(call));
+}
+
+TEST_F(ClientTest, JsonHoldsTheWarnings) {
+    EXPECT_EQ(run({"RunTxStop", "", "--json"}), 0);
+    EXPECT_THAT(out(), HasSubstr(R"("warnings":["channel is empty: )"));
+    EXPECT_EQ(err(), "");
+    EXPECT_EQ(run({"RunTxStop", "165", "--json"}), 0);
+    EXPECT_THAT(out(), ::testing::EndsWith("}\n"));
+}
+
+TEST_F(ClientTest, StrictRefusesWhatNoChipKnows) {
+    EXPECT_EQ(run({"--strict", "RunTxNStart", "6", "30", "7", "15", "true", "1"}), 2);
+    EXPECT_THAT(err(), IsOneLineWith("bandwidth \"30\" is none that a chip knows"));
+    EXPECT_THAT(mService->calls, ::testing::IsEmpty());
+    EXPECT_EQ(run({"--strict", "RunTxNStart", "14", "80", "15", "any", "true", "any"}), 0);
 }
 
 TEST_F(ClientTest, JsonOfALargeTextIsOneLine) {

@@ -63,7 +63,7 @@ TEST(HelpTest, NamesEveryMethodOptionAndExitCode) {
         EXPECT_THAT(inOneLine(help), HasSubstr(command.summary));
     }
     for (const char* option :
-         {"--json", "--require-count", "--timeout SECONDS", "--help, -h", "--version",
+         {"--json", "--require-count", "--strict", "--timeout SECONDS", "--help, -h", "--version",
           "list [--json]", "doctor [--json]", "stop [--json] [CHANNEL]", "  -- "}) {
         EXPECT_THAT(help, HasSubstr(option));
     }

@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: Apache-2.0
 
 // FakeService as a process: prints "ready" once it is registered and answers 0; a call on channel
-// "die" kills it, one on channel "hang" prints "called" and never ends.
+// 13 kills it, one on channel 14 prints "called" and never ends.
 
 #include <hidl/HidlTransportSupport.h>
 #include <unistd.h>
@@ -15,8 +15,8 @@ int main() {
     const ::android::sp<vendor::korvan::bex::wifi::client::FakeService> service =
             new vendor::korvan::bex::wifi::client::FakeService;
     service->onCall = [&calls = service->calls] {
-        if (calls.back().back() == "die") _exit(0);
-        if (calls.back().back() != "hang") return;
+        if (calls.back().back() == "13") _exit(0);
+        if (calls.back().back() != "14") return;
         std::cout << "called" << std::endl;
         pause();
     };

@@ -20,6 +20,8 @@ from support import output
 
 CLIENT = os.environ["BEX_WIFI_CLIENT"]
 SERVED_FAKE = os.environ["SERVED_FAKE"]
+# The channels on which it does so.
+DIE, HANG = "13", "14"
 
 MANIFEST = """<manifest version="1.0" type="device">
     <hal format="hidl">
@@ -115,21 +117,21 @@ def test_a_declared_service_is_waited_for_until_the_deadline():
 
 @pytest.mark.usefixtures("service")
 def test_a_service_that_dies_in_the_call_is_a_transport_failure():
-    done = run("RunTxStop", "die")
+    done = run("RunTxStop", DIE)
     assert (done.returncode, done.stdout) == (4, b"")
     assert "RunTxStop failed in the transport" in only_line(done)
 
 
 @pytest.mark.usefixtures("service")
 def test_the_deadline_ends_a_call():
-    done = run("RunTxStop", "hang", "--timeout", "2")
+    done = run("RunTxStop", HANG, "--timeout", "2")
     assert (done.returncode, done.stdout) == (5, b"")
     assert "deadline passed in RunTxStop" in only_line(done)
 
 
 @pytest.mark.parametrize("number", [signal.SIGINT, signal.SIGTERM])
 def test_a_signal_ends_a_call(service, number):
-    with subprocess.Popen([CLIENT, "RunTxStop", "hang"], stdout=subprocess.PIPE,
+    with subprocess.Popen([CLIENT, "RunTxStop", HANG], stdout=subprocess.PIPE,
                           stderr=subprocess.PIPE) as client:
         assert service.stdout.readline() == b"called\n"
         client.send_signal(number)
@@ -172,7 +174,7 @@ def test_a_closed_pipe_is_an_error_and_no_signal():
 # still open after a deadline.
 @pytest.mark.usefixtures("service")
 def test_a_closed_stdout_is_an_error():
-    done = run("RunTxStop", "hang", "--json", "--timeout", "1",
+    done = run("RunTxStop", HANG, "--json", "--timeout", "1",
                stdout=None, preexec_fn=lambda: os.close(1))
     assert done.returncode == 6
     assert only_line(done) == "cannot write the result to stdout: Bad file descriptor"
@@ -180,7 +182,7 @@ def test_a_closed_stdout_is_an_error():
 
 @pytest.mark.usefixtures("service")
 def test_closed_streams_do_not_change_the_exit_code():
-    done = run("RunTxStop", "die", stderr=None, preexec_fn=lambda: os.closerange(0, 3))
+    done = run("RunTxStop", DIE, stderr=None, preexec_fn=lambda: os.closerange(0, 3))
     assert (done.returncode, done.stdout) == (4, b"")
 
 
