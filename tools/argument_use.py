@@ -122,10 +122,15 @@ class MethodUse:
 
     def starts(self):
         """What the calls start: "transmission", "tone", "reception"; None for nothing."""
-        for kind, pattern in TEST_COMMANDS:
-            if any(re.search(pattern, line) for lines in self.answers.values() for line in lines):
-                return kind
-        return None
+        return next((kind for kind, _ in self._test_commands()), None)
+
+    def tools(self):
+        """The programs that start it."""
+        return {line.split(" ")[0] for _, line in self._test_commands()}
+
+    def _test_commands(self):
+        return ((kind, line) for kind, pattern in TEST_COMMANDS
+                for lines in self.answers.values() for line in lines if re.search(pattern, line))
 
     def remarks(self):
         """What surprises beyond the ignored arguments, a sentence each."""

@@ -54,8 +54,8 @@ OTHER_NAMES = {"wcn": "wcn3990", "qca": "qca6174", "qca639x": "QCA639X", "wcn685
 INTRODUCTION = """\
 # Command catalogue
 
-What the service runs, to read beside the manual of the chip's tool (`wl`, `myftm`, or the driver's
-private commands through `iwpriv`). One page for each chip family:
+What the service runs, to read beside the manual of the chip's tool. One page for each chip family,
+here with the tool that starts its tests (`iwpriv` passes on the driver's private commands):
 
 {pages}
 
@@ -156,10 +156,14 @@ def families(phones):
     return code_tables.markdown(["vendor", "chip", "family"], rows)
 
 
-def index(phones):
+def tools(uses):
+    return ", ".join(f"`{tool}`" for tool in sorted(set().union(*(use.tools() for use in uses))))
+
+
+def index(phones, uses):
     own = phones["wcn"].value("ro.hardware.wlan.chip")
     return INTRODUCTION.format(
-        pages="\n".join(f"- [{chip}]({chip}.md)" for chip in phones),
+        pages="\n".join(f"- [{chip}]({chip}.md): {tools(uses[chip])}" for chip in phones),
         families="\n".join(families(phones)), upper=own, lower=OTHER_NAMES["wcn"])
 
 
@@ -172,7 +176,7 @@ def wanted_files(explain):
                 for name, phone in phones.items()}
         found = {CATALOGUE / f"{name}.md": page(name, phone, uses[name])
                  for name, phone in phones.items()}
-        found[CATALOGUE / "README.md"] = index(phones)
+        found[CATALOGUE / "README.md"] = index(phones, uses)
         found[TABLE] = method_use_table.text(uses)
     return found
 

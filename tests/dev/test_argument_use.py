@@ -76,7 +76,9 @@ def test_an_option_that_brings_others_along():
     ("iwpriv wlan0 tx 0 ", None),
 ])
 def test_what_a_call_starts(line, kind):
-    assert use(lambda: [line]).starts() == kind
+    found = use(lambda: [line])
+    assert found.starts() == kind
+    assert found.tools() == ({line.split(" ")[0]} if kind else set())
 
 
 def test_remarks():
