@@ -10,6 +10,8 @@ import subprocess
 
 import pytest
 
+from support.adb import adb_fixture  # noqa: F401  (pytest finds the fixture here)
+
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 
 
@@ -116,6 +118,27 @@ def test_a_phone_until_ctrl_c(dev, phones):
         3, "dev: no phone is up: start one with ./dev phone CHIP\n")
 
 
+def test_several_phones_on_adb(phones, adb):
+    chips = ["broadcom", "wcn6750", "broadcom"]
+    with subprocess.Popen(
+            [ROOT / "dev", "phone", *chips], stdout=subprocess.PIPE, text=True,
+            env={**os.environ, "BEX_PHONES": str(phones)}, start_new_session=True) as run:
+        for number, chip in enumerate(chips):
+            connect = re.fullmatch(rf"The {chip} phone is up: adb (connect (\S+))\n",
+                                   run.stdout.readline())
+            folder = phones / f"up{number + 1 if number else ''}"
+            assert run.stdout.readline() \
+                == f"    serial number {connect[2]}, log {folder}/log\n"
+            assert adb(*connect[1].split()).stdout == f"connected to {connect[2]}\n".encode()
+            assert adb("-s", connect[2], "shell", "bex-wifi-client isSnifferMode").stdout == b"false\n"
+            assert f"{connect[2]} ".encode() in adb("devices", "-l").stdout
+        assert "./dev client" in run.stdout.readline()
+        os.killpg(run.pid, signal.SIGINT)
+        run.wait(60)
+    assert list(phones.glob("up*")) == []
+    assert processes_of(phones) == []
+
+
 def test_a_short_soak(dev, phones):
     soak = dev("soak", "0.1", "7")
     assert soak.returncode == 0, soak.stdout + soak.stderr
@@ -146,6 +169,7 @@ def test_a_soak_until_ctrl_c(phones):
 
 @pytest.mark.parametrize("arguments, message", [
     (["phone"], "dev: which chip? One of: broadcom"),
+    (["phone", "broadcom", "acme"], "dev: no phone for the chip 'acme': there is broadcom"),
     (["demo", "acme"], "dev: no phone for the chip 'acme': there is broadcom"),
     (["explain", "broadcom", "RunTxStop"], "explain: RunTxStop takes 1 argument"),
     (["explain", "broadcom", "runtxstop", "6"], "explain: unknown method"),
