@@ -65,7 +65,8 @@ def restart_service(folder):
 
 def _queue(folder):
     """Waits until no other command switches the phone. The next one waits for this one's end."""
-    if not _until(QUEUE_SECONDS, lambda turn=os.open(folder, os.O_RDONLY): _locks(turn)):
+    turn = os.open(folder, os.O_RDONLY)
+    if not _until(QUEUE_SECONDS, lambda: _locks(turn)):
         raise PhoneError(f"{folder} has been locked for {QUEUE_SECONDS} s")
 
 
