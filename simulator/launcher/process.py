@@ -24,6 +24,7 @@ from launcher.sandbox import ENVIRONMENT, KINDS, command_line, writable
 
 PR_SET_PDEATHSIG, PR_SET_CHILD_SUBREAPER = 1, 36  # from <linux/prctl.h>
 QUIT_SECONDS = 5
+INTERRUPTED = [128 + number for number in (signal.SIGHUP, signal.SIGINT, signal.SIGTERM)]
 
 # The shell reports what cannot be run as adb's does: 127 not found, 126 not executable. proot takes
 # death by a signal for success, so there the shell stays to turn it into 128 + n, whatever signal
@@ -75,7 +76,10 @@ def choose(folder):
     nothing = os.open(os.devnull, os.O_RDWR)
     for kind in KINDS:
         try:
-            if run(kind, folder, ["/system/bin/true"], [nothing] * 3) == 0:
+            code = run(kind, folder, ["/system/bin/true"], [nothing] * 3)
+            if code in INTERRUPTED:
+                raise KeyboardInterrupt
+            if code == 0:
                 return kind
             refusals.append(f"{kind} is refused here")
         except PhoneError as error:
@@ -182,12 +186,16 @@ class Sandbox:
         # A child of bwrap leads it, whose number is its own for as long as bwrap cannot reap it.
         os.kill(self.pid, signal.SIGSTOP)
         os.waitid(os.P_PID, self.pid, os.WSTOPPED | os.WEXITED | os.WNOWAIT)
+        reached = False
         for child in _children(self.pid):
             try:
                 os.killpg(child, number)
+                reached = True
             except ProcessLookupError:
                 pass  # it does not lead a session yet
         os.kill(self.pid, signal.SIGCONT)
+        if not reached and number in (signal.SIGINT, signal.SIGQUIT):
+            self._end(number)
 
     def _suspend(self, _number):
         self._signal(signal.SIGSTOP)

@@ -29,6 +29,14 @@ USERS = ("root", "nobody") if os.geteuid() == 0 else ("self",)
 STARTED = []
 
 
+def command_line(process):
+    """The arguments of a process, each with a NUL after it; nothing when it has gone."""
+    try:
+        return pathlib.Path(f"/proc/{process}/cmdline").read_text()
+    except OSError:
+        return ""
+
+
 class Launcher:
     """simulator/phone as one user, with one sandbox."""
 
@@ -106,8 +114,7 @@ class Phone:
     def sleepers(self):
         """The process numbers of the endless sleeps inside."""
         lines = (f"/phone/bin/busybox\0sleep\0{ENDLESS}\0", f"sleep\0{ENDLESS}\0")
-        return [number for number in self.processes()
-                if pathlib.Path(f"/proc/{number}/cmdline").read_text() in lines]
+        return [number for number in self.processes() if command_line(number) in lines]
 
     def processes(self):
         """The process numbers of this phone's commands and sandboxes on this machine."""

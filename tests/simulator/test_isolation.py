@@ -215,3 +215,17 @@ def test_without_namespaces_proot_is_chosen(program, place):
     assert (result.returncode, result.stderr) \
         == (1, "phone: no sandbox: bwrap is refused here; proot is refused here\n")
     assert sorted(path.name for path in place.iterdir()) == ["phone", "programs"]
+
+
+def test_an_interrupted_create_chooses_nothing(program, place):
+    """A bwrap that interrupts the launcher, as Ctrl-C would while it is starting."""
+    folder = place / "programs"
+    folder.mkdir()
+    (folder / "bwrap").write_text("#!/bin/sh\nread -r _ _ _ launcher _ </proc/$PPID/stat\n"
+                                  "kill -INT $launcher\nexec sleep 1000\n")
+    (folder / "bwrap").chmod(0o755)
+    launcher = Launcher(program, "", "root" if os.geteuid() == 0 else "self")
+    launcher.environment["PATH"] = f"{folder}:{os.environ['PATH']}"
+    result = launcher("create", "broadcom", place / "phone")
+    assert (result.returncode, result.stderr) == (130, "")
+    assert [path.name for path in place.iterdir()] == ["programs"]
