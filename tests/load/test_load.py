@@ -17,6 +17,9 @@ CLIENTS = 64
 CALLS = 10_000
 WARM_UP = 1_600
 POOL = 2
+STORM_CLIENTS = 16
+# So many answers between two restarts of a storm; BEX_STORM is how many restarts.
+STORM_ANSWERS = 24
 # Under proot, which halts a process at each of its system calls, a call takes fifty times as long.
 PART = {"bwrap": 1, "proot": 16}
 # A command under way: the shell and the tool, the pipe.
@@ -63,6 +66,7 @@ def test_load(phone):
     assert journal.commands() == own_answers.expected_commands(phone, calls)
 
     after = idle(gauge, descriptors)
+    print(f"{len(calls)} calls, {sum(journal.commands().values())} runs: {before} -> {after}")
     assert after.memory <= before.memory + MEMORY_KIB
     assert (after.threads, after.processes, after.files) == (POOL, before.processes, before.files)
     for held in during:
@@ -70,6 +74,35 @@ def test_load(phone):
         assert held.memory <= before.memory + MEMORY_KIB
         assert held.descriptors <= descriptors + CLIENTS + POOL * COMMAND_DESCRIPTORS
         assert held.processes <= before.processes + POOL * COMMAND_PROCESSES
+
+
+def test_storm(phone):
+    """A service that is killed again and again under its clients loses their calls under way, and
+    nothing else: no answer comes twice or to another call, and no command runs twice."""
+    kills = int(os.environ.get("BEX_STORM", "5"))
+    descriptors = Gauge(phone).read().descriptors
+    # Each client's call under way, and the next when it finds the service that is just ending.
+    most_lost = 2 * STORM_CLIENTS
+    calls = own_answers.make_calls(kills * (STORM_ANSWERS + most_lost) + STORM_ANSWERS, random.Random(3))
+    own_answers.journal_of(phone).unlink(missing_ok=True)
+    load = Load(phone, STORM_CLIENTS, calls)
+    killed = 0
+    for _ in load.arrivals():
+        answered = sum(answers not in ([], [None]) for answers in load.answers)
+        if killed < kills and answered >= (killed + 1) * STORM_ANSWERS:
+            phone.phone("restart-service", phone.folder)
+            killed += 1
+    assert (killed, load.ended) == (kills, 0)
+
+    lost = [number for number, answers in enumerate(load.answers) if answers == [None]]
+    assert len(lost) <= kills * most_lost
+    journal = own_answers.Journal(phone)
+    wrong = own_answers.wrong_answers(calls, load.answers, journal)
+    assert set(wrong) <= set(lost), wrong
+    assert journal.commands() - own_answers.expected_commands(phone, calls) == {}
+    held = idle(Gauge(phone), descriptors)
+    print(f"{kills} kills, {len(calls)} calls, {len(lost)} cut off, {held}")
+    assert held.threads == POOL
 
 
 @pytest.mark.parametrize("arguments, calls", [
