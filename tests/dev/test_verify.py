@@ -87,6 +87,9 @@ DISAGREEMENTS = [
     ("sniffer/Android.bp", '"bex-wifi-shell"', '"bex-wifi-shells"', "no module 'bex-wifi-shells'"),
     ("tests/target/Android.bp", '"libutils"', '"libhidl_gtest_helper"',
      "'libhidl_gtest_helper' is not known to be there for vendor modules"),
+    ("chips/ChipFamily.cpp", '{"qca", "qcom"', '{"qcb", "qcom"', "there is no simulator/phones/qcb"),
+    ("chips/ChipFamily.cpp", '{"wcn", "qcom"', '{"wcm", "qcom"', "ChipChoice.cpp has no row for 'wcm'"),
+    ("chips/ChipFamily.cpp", '{"wcn", "qcom"', '{"wcm", "qcom"', "families.py has no row for 'wcm'"),
     ("tests/unit/Android.bp", ":bex-wifi-recorder", ":bex-recorder", "no module 'bex-recorder'"),
 ]
 
@@ -119,6 +122,18 @@ def test_what_the_board_includes(copy, old, new, told):
     file = copy / "service/board.mk"
     file.write_text(file.read_text().replace(old, new))
     assert told in verify(copy).stderr
+
+
+@pytest.mark.parametrize("path", ["tests/fuzz/Operations.cpp", "benchmarks/TextBench.cpp"])
+def test_a_suite_that_a_list_lacks(copy, path):
+    file = copy / path
+    file.write_text(file.read_text().replace("Wcn6750TestSuit", "Wcn6751TestSuit"))
+    assert f"suites/Wcn6750TestSuit.h:1: {path} has no row for Wcn6750TestSuit" in verify(copy).stderr
+
+
+def test_a_phone_of_no_family(copy):
+    (copy / "simulator/phones/acme").write_text("")
+    assert "simulator/phones/acme:1: chips/ChipFamily.cpp has no such family" in verify(copy).stderr
 
 
 def test_a_source_that_soong_lacks(copy):

@@ -15,12 +15,7 @@
 
 namespace fuzz {
 
-using vendor::korvan::bex::wifi::V1_0::implementation::BrcmTestSuit;
-using vendor::korvan::bex::wifi::V1_0::implementation::Qca639xTestSuit;
-using vendor::korvan::bex::wifi::V1_0::implementation::QcaTestSuit;
-using vendor::korvan::bex::wifi::V1_0::implementation::Wcn39xxTestSuit;
-using vendor::korvan::bex::wifi::V1_0::implementation::Wcn6750TestSuit;
-using vendor::korvan::bex::wifi::V1_0::implementation::WcnTestSuit;
+using namespace vendor::korvan::bex::wifi::V1_0::implementation;
 
 namespace {
 
