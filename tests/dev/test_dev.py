@@ -107,6 +107,11 @@ def test_a_phone_until_ctrl_c(dev, phones):
         assert (second.returncode, second.stdout) == (1, "")
         assert second.stderr == "dev: a phone is up already: end that one first\n"
         assert dev("client", "isSnifferMode").stdout == "false\n"
+        traced = dev("client", "--trace", "RunTxStop", "6")
+        assert (traced.returncode, traced.stdout) == (0, "0\n")
+        assert '  "rmmod wlan.ko " -> ok\n' in traced.stderr
+        assert dev("client", "--trace", "RunTxStop").returncode == 2
+        assert 'cmd: "rmmod wlan.ko " successful execution' in dev("log").stdout
         wrong = dev("client", "RunTxStop")
         assert (wrong.returncode, wrong.stdout) == (2, "")
         os.killpg(phone.pid, signal.SIGINT)
