@@ -94,6 +94,7 @@ _bex_wifi_client() {{
     [ "${{COMP_WORDS[COMP_CWORD - 1]}}" != --timeout ] || return 0
     case $command:$place in
         :0) candidates="{commands}" ;;
+        help:0) candidates="{methods}" ;;
 {cases}
     esac
     [[ $current != -* ]] || candidates="{options}"
@@ -107,13 +108,14 @@ def completion(client):
     usage = ask(client, "--help")
     methods = explained.read_methods(ask(client, "list", "--json"))
     subcommands = re.findall(rf"^  {NAME} ([a-z]+)\b", usage, re.M)
-    options = re.findall(r"^  (--[a-z-]+)", usage, re.M)
+    options = re.findall(rf"^  (?:{NAME} )?(--[a-z-]+)", usage, re.M)
+    names = " ".join(method.name for method in methods)
     cases = [f'        {method.name}:{place}) candidates="{" ".join(argument.choices())}" ;;'
              for method in methods for place, argument in enumerate(method.arguments)
              if argument.choices()]
     return COMPLETION.format(
         name=NAME, cases="\n".join(cases), options=" ".join(options),
-        commands=" ".join([*subcommands, *[method.name for method in methods]]))
+        commands=" ".join([*subcommands, names]), methods=names)
 
 
 def main():

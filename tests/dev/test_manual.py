@@ -78,6 +78,8 @@ def test_a_method_is_completed(complete, methods):
     (["RunTxNStart", "36", "80", "7", "-20", "t"], ["true"]),
     (["--timeout", ""], []),
     (["RunTxStop", "6", "--j"], ["--json"]),
+    (["--v"], ["--version"]),
+    (["help", "RunRxS"], ["RunRxStop"]),
     (["RunTxStop", "6", ""], []),
 ])
 def test_an_argument_is_completed(complete, words, offered):

@@ -36,6 +36,12 @@ def test_it_names_what_it_needs(package):
         assert name in needed
 
 
+def test_its_version_is_the_clients(package, usr):
+    version = printed("dpkg-deb", "-f", package, "Version").strip()
+    assert printed(usr / "bin/bex-wifi-client", "--version").startswith(
+        f"bex-wifi-client {version}\n")
+
+
 def test_what_belongs_to_the_client_is_there(usr):
     assert (usr / "share/man/man1/bex-wifi-client.1.gz").is_file()
     assert (usr / "share/bash-completion/completions/bex-wifi-client").is_file()
