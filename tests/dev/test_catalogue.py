@@ -14,7 +14,7 @@ ROOT = pathlib.Path(__file__).resolve().parents[2]
 
 def check(tree):
     return subprocess.run([tree / "tools/catalogue.py", "--check", os.environ["BEX_EXPLAIN"]],
-                          capture_output=True, text=True, check=False, timeout=120)
+                          capture_output=True, text=True, check=False, timeout=600)
 
 
 def test_it_is_up_to_date():
