@@ -103,9 +103,10 @@ def _become(folder, listener, ready):
             fcntl.lockf(record, fcntl.LOCK_EX | fcntl.LOCK_NB)
             record.truncate(0)
             record.write(b"%s:%d\n" % (HOST.encode(), listener.getsockname()[1]))
+            device = Device(folder, listener)
             os.write(ready, b"!")
             os.close(ready)
-            Device(folder, listener).run()
+            device.run()
         status = 0
     except BaseException as error:  # pylint: disable=broad-except
         sys.excepthook(type(error), error, error.__traceback__)

@@ -28,6 +28,7 @@ class Device:
         self._connections = set()
         self._interrupted = asyncio.Event()
         self._ends = False
+        self._banner = _banner(folder)
 
     def run(self):
         """Returns on SIGTERM, once everything that was started has ended."""
@@ -67,7 +68,11 @@ class Device:
     async def _accept(self):
         loop = asyncio.get_running_loop()
         while True:
-            peer, _ = await loop.sock_accept(self._listener)
+            try:
+                peer, _ = await loop.sock_accept(self._listener)
+            except OSError:  # no descriptor is free, or the peer has gone already
+                await asyncio.sleep(0.1)
+                continue
             if len(self._connections) == MOST_CONNECTIONS:
                 peer.close()
                 continue
@@ -78,13 +83,7 @@ class Device:
     async def _connect(self, peer):
         peer.setsockopt(socket.IPPROTO_TCP, socket.TCP_NODELAY, 1)
         reader, writer = await asyncio.open_connection(sock=peer)
-        await Connection(reader, writer, self._banner(), self._service).serve()
-
-    def _banner(self):
-        with open(f"{self._folder}/chip", encoding="utf-8") as record:
-            chip = re.sub(r"[^\w.-]", "_", record.read().strip(), flags=re.ASCII)
-        return (f"device::ro.product.name=simulated;ro.product.model={chip};"
-                f"ro.product.device={chip};features=shell_v2,stat_v2,fixed_push_mkdir").encode()
+        await Connection(reader, writer, self._banner, self._service).serve()
 
     def _service(self, name):
         """The coroutine function that serves the service of this name, or None."""
@@ -97,6 +96,13 @@ class Device:
 
     async def _sync(self, stream):
         await sync.serve(f"{self._folder}/root", stream)
+
+
+def _banner(folder):
+    with open(f"{folder}/chip", encoding="utf-8") as record:
+        chip = re.sub(r"[^\w.-]", "_", record.read().strip(), flags=re.ASCII)
+    return (f"device::ro.product.name=simulated;ro.product.model={chip};"
+            f"ro.product.device={chip};features=shell_v2,stat_v2,fixed_push_mkdir").encode()
 
 
 def _show_log(folder):

@@ -9,7 +9,7 @@ import collections
 import struct
 
 VERSION = 0x01000001  # from this one on nobody looks at the sum
-LONGEST_DATA = 1 << 20
+LONGEST_DATA = 1 << 18
 SHORTEST_LIMIT = 4096  # what every peer takes
 
 CNXN, OPEN, OKAY, WRTE, CLSE = (int.from_bytes(name, "little")

@@ -101,21 +101,23 @@ class Process:
 
     async def serve(self, stream):
         """Returns when the command has ended and the peer knows."""
-        work = asyncio.gather(*(self._pass_on(descriptor, kind, stream)
-                                for descriptor, kind in self._outputs), readable(self._ended))
-        input_ = asyncio.create_task(self._feed(stream))
+        outputs = [asyncio.create_task(task) for task in (
+            *(self._pass_on(descriptor, kind, stream) for descriptor, kind in self._outputs),
+            readable(self._ended))]
+        tasks = running = {*outputs, asyncio.create_task(self._feed(stream))}
         try:
-            await asyncio.wait({work, input_}, return_when=asyncio.FIRST_COMPLETED)
-            if not work.done():
-                input_.result()  # raises
-            await work
+            while not all(task.done() for task in outputs):
+                done, running = await asyncio.wait(running, return_when=asyncio.FIRST_COMPLETED)
+                for task in done:
+                    task.result()  # raises what ended it, as the input always does
             if self._command.with_packets:
                 code = self._process.wait()
                 await stream.write(_packet(EXIT, bytes([code if code >= 0 else 128 - code])))
         finally:
-            for task in (work, input_):
+            # No task may be left that waits for a descriptor whose number another one will have.
+            for task in tasks:
                 task.cancel()
-            await asyncio.gather(work, input_, return_exceptions=True)
+            await asyncio.gather(*tasks, return_exceptions=True)
 
     async def end(self):
         """Hangs up what has not ended."""
@@ -199,10 +201,15 @@ def _streams(command):
         master, slave = pty.openpty()
         os.set_blocking(master, False)
         return master, [(master, STDOUT)], (slave, slave, slave)
-    read_in, write_in = os.pipe()
-    read_out, write_out = os.pipe()
+    pipes = []
+    try:
+        for _ in range(3 if command.with_packets else 2):
+            pipes.append(os.pipe())
+    except OSError:
+        for descriptor in sum(pipes, ()):
+            os.close(descriptor)
+        raise
+    (read_in, write_in), *outputs = pipes
     os.set_blocking(write_in, False)
-    if not command.with_packets:
-        return write_in, [(read_out, STDOUT)], (read_in, write_out, write_out)
-    read_err, write_err = os.pipe()
-    return write_in, [(read_out, STDOUT), (read_err, STDERR)], (read_in, write_out, write_err)
+    ours = [(output, kind) for (output, _), kind in zip(outputs, (STDOUT, STDERR))]
+    return write_in, ours, (read_in, outputs[0][1], outputs[-1][1])

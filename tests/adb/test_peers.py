@@ -89,6 +89,21 @@ def test_a_peer_that_takes_nothing_keeps_nobody_else_waiting(phone, peer):
         peer.answer()
 
 
+def test_a_stream_left_in_the_middle_of_its_output_spoils_no_later_one(phone, peer):
+    peer.greet()
+    for number in range(1, 9, 2):
+        left = peer.open(b"shell,v2,raw:busybox yes\0", number)
+        assert peer.answer()[:3] == (b"WRTE", left, number)
+        peer.sendall(message(b"CLSE", number, left))
+        wait_for(lambda: processes_of(phone) == [])
+        later = peer.open(b"shell,v2,raw:echo out; exit 3\0", number + 1)
+        packets = b""
+        while (answer := peer.answer())[0] == b"WRTE":
+            packets += answer[3]
+            peer.sendall(message(b"OKAY", number + 1, later))
+        assert packets == struct.pack("<BI", 1, 4) + b"out\n" + struct.pack("<BI", 3, 1) + b"\3"
+
+
 def test_a_packet_may_come_in_pieces(peer):
     stream = peer.greet().open(b"shell,v2,raw:cat\0")
     for piece in (b"\0", b"\3\0\0", b"\0a", b"bc\4\0\0\0", b"\0"):

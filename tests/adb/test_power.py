@@ -88,11 +88,7 @@ def test_a_reboot_is_a_power_cycle(phone):
         assert client.stdout.readline() == b"started\n"
         assert phone.do("reboot").returncode == 0
         client.wait(TIMEOUT)
-
-    def connected():
-        return phone.connect() == f"connected to {phone.serial}\n"
-
-    wait_for(connected)
+    wait_for(phone.connects)
     assert phone.shell("getprop vendor.test") == (0, b"\n", b"")
     assert phone.shell("bex-wifi-client isSnifferMode") == (0, b"false\n", b"")
     assert (phone.folder / "adb.log").read_text() == ""

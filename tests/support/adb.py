@@ -15,6 +15,7 @@ import tempfile
 import pytest
 
 from support.phone import PHONE, Phone
+from support.waiting import wait_for
 
 TIMEOUT = 60
 
@@ -50,12 +51,12 @@ class AdbPhone(Phone):
         up = subprocess.run([PHONE, "up", self.folder, "--adb"], check=True, timeout=TIMEOUT,
                             stdout=subprocess.PIPE, text=True)
         self.serial = up.stdout.strip()
-        assert self.connect() == f"connected to {self.serial}\n"
+        wait_for(self.connects)
 
-    def connect(self):
-        """What adb says to it."""
+    def connects(self):
+        """Whether adb reaches it within adb's own deadline."""
         self.forget()
-        return self.adb("connect", self.serial).stdout.decode()
+        return self.adb("connect", self.serial).stdout == f"connected to {self.serial}\n".encode()
 
     def forget(self):
         """Keeps the server from trying a phone that has gone."""
