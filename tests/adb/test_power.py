@@ -131,17 +131,25 @@ def test_killing_the_process_behind_adb_ends_what_adb_s_clients_run(phone):
     assert "on adb already" not in again.stderr
 
 
+def bound(port):
+    """A socket that has the port, beside others that are bound to it but do not listen."""
+    taker = socket.socket()
+    taker.setsockopt(socket.SOL_SOCKET, socket.SO_REUSEADDR, 1)
+    taker.bind(("127.0.0.1", port))
+    return taker
+
+
 def test_a_port_of_one_s_own(phone):
-    with socket.socket() as taken:
-        taken.bind(("127.0.0.1", 0))
-        taken.listen()
-        port = str(taken.getsockname()[1])
-        refused = launcher("up", phone.folder, "--adb", port)
-        assert (refused.returncode, refused.stdout) == (1, "")
-        assert refused.stderr == f"phone: adb cannot have port {port}: Address already in use\n"
-        assert not phone.is_up()
-    asked = launcher("up", phone.folder, "--adb", port)
-    assert (asked.stdout, asked.stderr) == (f"127.0.0.1:{port}\n", "")
+    with bound(0) as reserved:  # nobody else is given it meanwhile
+        port = str(reserved.getsockname()[1])
+        with bound(int(port)) as taken:
+            taken.listen()
+            refused = launcher("up", phone.folder, "--adb", port)
+            assert (refused.returncode, refused.stdout) == (1, "")
+            assert refused.stderr == f"phone: adb cannot have port {port}: Address already in use\n"
+            assert not phone.is_up()
+        asked = launcher("up", phone.folder, "--adb", port)
+        assert (asked.stdout, asked.stderr) == (f"127.0.0.1:{port}\n", "")
 
 
 @pytest.mark.parametrize("port", ["65536", "-1", "adb", "٣"])
