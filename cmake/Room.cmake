@@ -76,6 +76,9 @@ function(process_test name)
     endif()
     math(EXPR TEST_TIMEOUT "${TEST_TIMEOUT} * ${TIMEOUT_FACTOR}")
     list(TRANSFORM TEST_UNPARSED_ARGUMENTS PREPEND ${CMAKE_CURRENT_SOURCE_DIR}/)
+    # Its folders belong in the build, not in /tmp.
+    file(MAKE_DIRECTORY ${PROJECT_BINARY_DIR}/pytest)
+    list(APPEND TEST_ENVIRONMENT PYTEST_DEBUG_TEMPROOT=${PROJECT_BINARY_DIR}/pytest)
     add_test(NAME ${name} COMMAND /usr/bin/python3 -B -m pytest -q -p no:cacheprovider
                                   ${TEST_UNPARSED_ARGUMENTS}
     )

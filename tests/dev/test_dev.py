@@ -115,8 +115,8 @@ def test_a_phone_until_ctrl_c(dev, phones):
         wrong = dev("client", "RunTxStop")
         assert (wrong.returncode, wrong.stdout) == (2, "")
         os.killpg(phone.pid, signal.SIGINT)
-        assert phone.wait(60) == 0
-    assert list(phones.iterdir()) == []
+        assert phone.wait(60) == 130
+    assert [path.name for path in phones.iterdir()] == ["owner"]
     assert processes_of(phones) == []
     gone = dev("client", "isSnifferMode")
     assert (gone.returncode, gone.stderr) == (
@@ -181,6 +181,15 @@ def test_a_soak_until_ctrl_c(phones):
     (["test", "--arch"], "dev: which architecture? There is --arch arm64"),
     (["test", "--arch", "mips"], "dev: which architecture? There is --arch arm64"),
     (["soak", "soon"], "dev: MINUTES is a number like 60 or 0.5, not 'soon'"),
+    (["soak", "1", "x"], "dev: SEED is a number, not 'x'"),
+    (["demo", "broadcom", "extra"], "dev: too many arguments: 'extra'"),
+    (["check", "--fast"], "dev: too many arguments: '--fast'"),
+    (["test", "--sanitize=memory"], "dev: --sanitize takes address or thread"),
+    (["test", "--arch="], "dev: which architecture? There is --arch arm64"),
+    (["test", "--frob"], "dev: test takes no '--frob'"),
+    (["test", "load"], "dev: test takes no 'load'"),
+    (["test", "-R"], "dev: -R takes a value"),
+    (["help", "start"], "dev: there is no command 'start'"),
     (["soak", "1", "2", "3"], "dev: soak takes MINUTES and SEED at most"),
     (["fuzz", "acme"], "dev: no fuzz target 'acme': there is framing"),
     (["fuzz", "../corpus/tools"], "dev: no fuzz target '../corpus/tools'"),
@@ -199,6 +208,28 @@ def test_wrong_usage_is_one_line(dev, arguments, message):
     assert wrong.stdout == ""
     assert wrong.stderr.startswith(message)
     assert len(wrong.stderr.splitlines()) == 1
+
+
+@pytest.mark.parametrize("arguments", [["check", "--help"], ["help", "check"], ["check", "-h"]])
+def test_help_of_one_command_is_all_that_happens(dev, arguments):
+    told = dev(*arguments)
+    assert (told.returncode, told.stderr) == (0, "")
+    assert told.stdout.startswith("./dev check ")
+    assert "./dev demo" not in told.stdout
+
+
+def test_the_clients_help_needs_no_phone(dev):
+    told = dev("client", "--help")
+    assert told.returncode == 0
+    assert "RunTxBGStart" in told.stdout
+
+
+def test_what_a_killed_run_left_goes_with_the_next(dev, phones):
+    # No process has so high a number.
+    for name in ("demo-99999999", ".demo-99999999.x1y2"):
+        (phones / name).mkdir(parents=True)
+    assert dev("explain", "broadcom", "RunTxStop", "6").returncode == 0
+    assert list(phones.iterdir()) == []
 
 
 def test_help_names_the_chips(dev):
