@@ -245,7 +245,8 @@ int __android_log_print(int priority, const char* tag, const char* format, ...) 
     if (length < 0) return length;
     {
         const std::lock_guard lock(recorder::gMutex);
-        if (recorder::gRecording.on) recorder::gRecording.log.push_back({priority, tag, text, format});
+        if (recorder::gRecording.on)
+            recorder::gRecording.log.push_back({priority, tag, text, format});
     }
     free(text);
     return length;
