@@ -3,7 +3,8 @@
 
 #pragma once
 
-#include <future>
+#include <condition_variable>
+#include <mutex>
 
 namespace vendor::korvan::bex::wifi::client {
 
@@ -14,19 +15,38 @@ namespace vendor::korvan::bex::wifi::client {
 class Gate {
   public:
     ~Gate() {
-        mRelease.set_value();
-        mEnded.get_future().wait();
+        std::unique_lock<std::mutex> lock(mLock);
+        mOpen = true;
+        mChanged.notify_all();
+        mChanged.wait(lock, [this] { return mLeft; });
     }
 
     void wait() {
-        mOpen.wait();
-        mEnded.set_value_at_thread_exit();
+        std::unique_lock<std::mutex> lock(mLock);
+        mChanged.wait(lock, [this] { return mOpen; });
+        static thread_local AtThreadExit atExit;
+        atExit.gate = this;
     }
 
   private:
-    std::promise<void> mRelease;
-    std::promise<void> mEnded;
-    const std::shared_future<void> mOpen = mRelease.get_future().share();
+    // The standard library's own way is one that ThreadSanitizer cannot follow.
+    struct AtThreadExit {
+        Gate* gate = nullptr;
+        ~AtThreadExit() {
+            if (gate != nullptr) gate->leave();
+        }
+    };
+
+    void leave() {
+        const std::lock_guard<std::mutex> guard(mLock);
+        mLeft = true;
+        mChanged.notify_all();
+    }
+
+    std::mutex mLock;
+    std::condition_variable mChanged;
+    bool mOpen = false;
+    bool mLeft = false;
 };
 
 } // namespace vendor::korvan::bex::wifi::client
