@@ -136,7 +136,8 @@ def test_a_shell_at_a_terminal(at_terminal):
     # adb misses a change while it is not reading from its terminal.
     sizes = itertools.cycle([34, 35])
     terminal.wait_for(b"resized\r\n", lambda: terminal.resize(next(sizes), 78))
-    terminal.type(b"echo before; sleep 1000 && echo slept\n")
+    # Said by the command: only then is Ctrl-C meant for it, and no longer for the shell.
+    terminal.type(b"sh -c 'echo before; exec sleep 1000' && echo slept\n")
     terminal.wait_for(b"\nbefore\r\n")
     terminal.type(b"\x03")
     terminal.wait_for(b"# ")
