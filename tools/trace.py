@@ -13,6 +13,7 @@ import pathlib
 import subprocess
 import sys
 
+import script
 from demo import PHONE, show_commands
 
 
@@ -30,7 +31,4 @@ def main():
 
 
 if __name__ == "__main__":
-    try:
-        sys.exit(main())
-    except KeyboardInterrupt:
-        sys.exit(130)
+    script.run(main)

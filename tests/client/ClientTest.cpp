@@ -216,6 +216,7 @@ TEST_F(ClientTest, ExitCode2WhenNoCommandLineCanHoldAnArgument) {
     // The longest with one letter before it, the blanks after both, and the NUL.
     const size_t longest = 32 * static_cast<size_t>(getpagesize()) - 4;
     EXPECT_EQ(run({"RunTxStop", std::string(longest, '6')}), 0);
+    mErr.str("");
     EXPECT_EQ(run({"RunTxStop", std::string(longest + 1, '6')}), 2);
     EXPECT_EQ(mService->calls.size(), 1u);
     EXPECT_EQ(err(), "bex-wifi-client: channel has " + std::to_string(longest + 1) +

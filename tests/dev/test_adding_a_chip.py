@@ -80,7 +80,7 @@ def test_the_page(tmp_path):
     copy = tmp_path / "checkout"
     shutil.copytree(ROOT, copy, ignore=shutil.ignore_patterns("build", ".git"), symlinks=True)
     shutil.copytree(ROOT / BUILD, copy / BUILD, symlinks=True,
-                    ignore=shutil.ignore_patterns("tests", "benchmarks", "Testing"))
+                    ignore=shutil.ignore_patterns("tests", "benchmarks", "Testing", "pytest"))
     built = {name: str(copy / BUILD / path) for name, path in PROGRAMS.items()}
     make = [*sandbox(copy), "cmake", "--build", BUILD, "--target"]
 
