@@ -10,7 +10,7 @@ import subprocess
 
 import pytest
 
-from support.adb import TIMEOUT, processes_of
+from support.adb import TIMEOUT, Running, processes_of
 from support.phone import ROOT
 from support.waiting import wait_for
 
@@ -24,14 +24,15 @@ def block_with(text):
     return next(block for block in blocks if text in block)
 
 
-def run_block(phone, block, folder, **options):
-    return subprocess.Popen(["bash", "-c", block], cwd=folder, stdout=subprocess.PIPE,
-                            stderr=subprocess.PIPE,
-                            env={**phone.adb.environment, "SERIAL": phone.serial}, **options)
+def run_block(phone, block, folder):
+    return Running(["bash", "-c", block], cwd=folder, stdout=subprocess.PIPE,
+                   stderr=subprocess.PIPE,
+                   env={**phone.adb.environment, "SERIAL": phone.serial})
 
 
 def finish(process):
-    out, err = process.communicate(timeout=TIMEOUT)
+    with process:
+        out, err = process.communicate(timeout=TIMEOUT)
     return process.returncode, out, err
 
 
@@ -126,13 +127,13 @@ def test_the_lock_keeps_calls_apart_and_passes_the_exit_code_on(phone, held, tmp
     lock = block_with("flock").replace("/tmp/", f"{tmp_path}/")
     wait_until_waiting, release = held("wl")
     since = phone.log.stat().st_size
-    calls = [run_block(phone, lock, tmp_path) for _ in range(2)]
-    wait_until_waiting()
-    busy = subprocess.run(["flock", "-n", next(tmp_path.glob("*.lock")), "true"], check=False,
-                          timeout=TIMEOUT)
-    assert busy.returncode == 1
-    release()
-    assert [finish(call)[:2] for call in calls] == [(1, b"-1\n")] * 2  # nothing transmits
+    with run_block(phone, lock, tmp_path) as one, run_block(phone, lock, tmp_path) as other:
+        wait_until_waiting()
+        busy = subprocess.run(["flock", "-n", next(tmp_path.glob("*.lock")), "true"], check=False,
+                              timeout=TIMEOUT)
+        assert busy.returncode == 1
+        release()
+        assert [finish(call)[:2] for call in (one, other)] == [(1, b"-1\n")] * 2  # nothing transmits
     lines = phone.explain("RunTxStop", "6")
     assert len(lines) > 1
     assert [line for line, _ in phone.commands(since)] == lines * 2

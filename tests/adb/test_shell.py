@@ -25,7 +25,7 @@ class Terminal:
         self.master, slave = pty.openpty()
         self.resize(33, 77)
         self.process = phone.adb.start("-s", phone.serial, *arguments, stdin=slave, stdout=slave,
-                                       stderr=slave, start_new_session=True,
+                                       stderr=slave,
                                        preexec_fn=lambda: fcntl.ioctl(0, termios.TIOCSCTTY, 0))
         os.close(slave)
         os.set_blocking(self.master, False)

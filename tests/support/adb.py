@@ -9,6 +9,7 @@ for no emulators: the user's server and phones are left alone.
 import contextlib
 import os
 import pathlib
+import signal
 import subprocess
 import tempfile
 
@@ -18,6 +19,19 @@ from support.phone import PHONE, Phone
 from support.waiting import wait_for
 
 TIMEOUT = 60
+
+
+class Running(subprocess.Popen):
+    """A program and what it starts. A test that fails in its `with` block ends them: it neither waits
+    for them nor leaves them behind."""
+
+    def __init__(self, *arguments, **options):
+        super().__init__(*arguments, **{**options, "start_new_session": True})
+
+    def __exit__(self, kind, *rest):
+        if kind is not None and self.poll() is None:
+            os.killpg(self.pid, signal.SIGKILL)
+        super().__exit__(kind, *rest)
 
 
 class Adb:
@@ -36,7 +50,7 @@ class Adb:
                               timeout=TIMEOUT, **{"capture_output": True, **stdin, **options})
 
     def start(self, *arguments, **options):
-        return subprocess.Popen(["adb", *arguments], env=self.environment, **options)
+        return Running(["adb", *arguments], env=self.environment, **options)
 
 
 class AdbPhone(Phone):
@@ -81,8 +95,10 @@ class AdbPhone(Phone):
 def adb_fixture():
     with tempfile.TemporaryDirectory(prefix="bex-adb-") as home:
         adb = Adb(home)
-        yield adb
-        adb("kill-server")
+        try:
+            yield adb
+        finally:
+            adb("kill-server")
 
 
 @contextlib.contextmanager
