@@ -26,6 +26,9 @@ class RemoteBinder : public IBinder {
     status_t unlinkToDeath(const wp<DeathRecipient>& recipient, void* cookie = nullptr,
                            uint32_t flags = 0, wp<DeathRecipient>* out = nullptr) override;
 
+    /** Whether the server is there, and had no room for this client: so end all calls. */
+    bool isRefused() { return mSession->isRefused(); }
+
   private:
     void sendObituaries();
 

@@ -73,9 +73,12 @@ sp<IBase> lookUp(const std::string& path, const std::string& descriptor) {
     }
     std::unique_ptr<host::Session> session = host::Session::open(path);
     if (session == nullptr) return nullptr;
-    sp<IBase> remote = new BpHwBase(new host::RemoteBinder(std::move(session)));
+    const sp<host::RemoteBinder> binder = new host::RemoteBinder(std::move(session));
+    sp<IBase> remote = new BpHwBase(binder);
     const Return<bool> fits = canCastInterface(remote.get(), descriptor.c_str(), true);
-    return fits.isOk() && fits ? remote : nullptr;
+    // A full server is there all the same: the call is what tells the caller.
+    if (!fits.isOk()) return binder->isRefused() ? remote : nullptr;
+    return fits ? remote : nullptr;
 }
 
 sp<IBase> waitFor(const std::string& path, const std::string& descriptor,

@@ -112,4 +112,9 @@ void Session::end(status_t status) {
     mChanged.notify_all();
 }
 
+bool Session::isRefused() {
+    std::lock_guard<std::mutex> lock(mMutex);
+    return mStatus == WOULD_BLOCK;
+}
+
 } // namespace android::hardware::host

@@ -39,6 +39,8 @@ class Session {
      * @param status DEAD_OBJECT when the server is gone, WOULD_BLOCK when it never let this in.
      */
     void end(status_t status);
+    /** Whether the server had no room for this client. */
+    bool isRefused();
 
     /** Hangs up when the session dies; open as long as the session exists. */
     int first() const { return mConnections.front().get(); }

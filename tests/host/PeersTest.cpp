@@ -23,6 +23,7 @@ using ::android::base::unique_fd;
 using ::android::hardware::hidl_string;
 using ::android::hardware::IBinder;
 using ::android::hardware::Parcel;
+using ::android::hardware::Return;
 using ::android::hardware::host::FrameHeader;
 using ::android::hardware::host::RemoteBinder;
 using ::android::hardware::host::Session;
@@ -161,6 +162,14 @@ TEST_F(FullServerTest, TellsARefusedClient) {
             EXPECT_EQ(binder->transact(16, call, &reply), WOULD_BLOCK) << size;
         }
     }
+}
+
+TEST_F(FullServerTest, IsFoundByAClientThatItRefuses) {
+    const sp<IWifiService> found = IWifiService::tryGetService();
+    ASSERT_NE(found, nullptr);
+    const Return<int32_t> result = found->getWlanMode();
+    EXPECT_FALSE(result.isOk());
+    EXPECT_NE(result.description().find("WOULD_BLOCK"), std::string::npos) << result.description();
 }
 
 // Those that the proxy's other connection serves: nobody is told that the service is dead.
