@@ -209,3 +209,11 @@ def test_the_supervised_commands_own_exit_code():
 
     assert code_of("exit 7") == 7
     assert code_of("kill -KILL $$") == 137
+
+
+def test_an_orphan_that_has_ended_is_gone():
+    # The shell waits for a process whose parent has ended.
+    script = 'orphan=$(sleep 1 >/dev/null & echo $!); while [ -e "/proc/$orphan" ]; do sleep 0.05; done'
+    supervised = subprocess.run([ROOT / "tools/dev/supervise.py", "bash", "-c", script], check=False,
+                                timeout=60)
+    assert supervised.returncode == 0

@@ -7,7 +7,7 @@
 readonly BUILD_PACKAGES=(g++ cmake ninja-build hidl-gen android-libbase-dev android-libcutils-dev
     android-liblog-dev android-libutils-dev libtinyxml2-dev libgtest-dev libgmock-dev libbenchmark-dev)
 readonly PHONE_PACKAGES=(busybox python3 mksh bubblewrap proot)
-readonly PACKAGE_PACKAGES=(python3 groff-base dpkg-dev)
+readonly PACKAGE_PACKAGES=(python3 groff-base dpkg-dev file)
 readonly TEST_PACKAGES=("${PACKAGE_PACKAGES[@]}" git make adb python3-pytest python3-lxml
     python3-jsonschema checkpolicy m4 valgrind)
 readonly BENCH_PACKAGES=(python3 valgrind)

@@ -82,8 +82,12 @@ def main(command):
     started = subprocess.Popen(command, stdin=subprocess.DEVNULL, preexec_fn=lambda: os.setpgid(0, 0))
     code = None
     while code is None and not received:
-        with contextlib.suppress(subprocess.TimeoutExpired):
-            code = started.wait(0.2)
+        # Orphans, too: who waits for the end of one looks whether its number is still there.
+        ended, status = os.waitpid(-1, os.WNOHANG)
+        if ended == started.pid:
+            code = started.returncode = os.waitstatus_to_exitcode(status)
+        elif ended == 0:
+            time.sleep(0.05)
     if code is not None:
         end_the_rest(lambda: False)
         return code if code >= 0 else 128 - code
