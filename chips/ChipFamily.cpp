@@ -18,8 +18,8 @@ constexpr DriverFile kFirmware     = {"/etc/firmware/fw_bcmdhd.bin",            
 
 } // namespace
 
-// A name with WCN or QCA in upper case never gets to the digits. A unit test compares the tools and
-// files with the command lines of every operation.
+// A name that holds WCN or QCA in upper case fits before the rows with digits are tried. A unit
+// test compares the tools and files with the command lines of every operation.
 // clang-format off
 const std::vector<ChipFamily>& chipFamilies() {
     static const std::vector<ChipFamily> kFamilies = {

@@ -16,11 +16,11 @@ struct DriverFile {
     const char* path;
     /** The module whose presence brings the file; empty for a file that is always there. */
     const char* module;
-    /** Whether that module is unloaded at times, so that the absence of both is no fault. */
+    /** Whether that module is sometimes not loaded, so that both may be missing without a fault. */
     bool comesAndGoes;
 };
 
-/** The chips that are driven in one way: how they are recognised, what their phones must have. */
+/** Chips that are driven in one way: how to recognise them, and what their phones must have. */
 struct ChipFamily {
     /** Short and unique: "qca639x". Also the name of the simulated phone. */
     const char* name;

@@ -9,7 +9,7 @@
 namespace vendor::korvan::bex::wifi {
 
 /**
- * What some chip families make of a method's arguments where a caller would not expect it.
+ * How some chip families use a method's arguments in a way that a caller would not expect.
  *
  *     if (const MethodUse* use = findMethodUse("qca", "RunTxBGStart")) {
  *         for (std::string_view name : use->ignored) std::cout << name << " is ignored\n";
@@ -22,14 +22,14 @@ struct MethodUse {
     std::vector<std::string_view> families;
     /** The arguments whose values change nothing, by the interface's names and in its order. */
     std::vector<std::string_view> ignored;
-    /** What else surprises, a sentence each. */
+    /** What else a caller would not expect, one sentence each. */
     std::vector<std::string_view> remarks;
 };
 
-/** All there is to tell. A family that uses all that it is given has no entry for the method. */
+/** All entries. A family that uses all of a method's arguments has none for it. */
 const std::vector<MethodUse>& methodUses();
 
-/** What there is to tell of one family's method; null when there is nothing. */
+/** The entry for a method of a family; null when there is none. */
 const MethodUse* findMethodUse(std::string_view family, std::string_view method);
 
 } // namespace vendor::korvan::bex::wifi

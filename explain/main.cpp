@@ -139,7 +139,7 @@ int main(int argc, char** argv) {
 
     const char* root = getenv("HIDL_HOST_ROOT");
     const Modules modules = modulesOf(root == nullptr ? "" : root);
-    // From here on the process sees the files that it shows, and no others.
+    // From here on the process sees only the files that `shell` has.
     recorder::RecordedShell shell;
     show(modules, shell);
     const sp<IWifiService> service = new implementation::WifiService();

@@ -80,7 +80,7 @@ int finish(FILE* stream) {
     return answer->status;
 }
 
-/** The function of the C library that `ours` stands in front of. */
+/** The C library's function that `ours` replaces. */
 template <typename Function>
 Function* original(const char* name, Function* /*ours*/) {
     return reinterpret_cast<Function*>(dlsym(RTLD_NEXT, name));

@@ -40,7 +40,7 @@ class RecordedShell {
         int priority;
         std::string tag;
         std::string text;
-        /** What the text was made from. Takes no part in a comparison. */
+        /** What the text was made from. Comparisons ignore it. */
         std::string format = {};
         bool operator==(const LogLine& other) const;
     };

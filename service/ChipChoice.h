@@ -10,7 +10,7 @@
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
-/** What drives a chip: each makes a new object, for the caller to delete. */
+/** What drives a chip. Each function makes a new object, which the caller deletes. */
 struct ChipChoice {
     VendorTestSuit* (*makeSuit)();
     SnifferTool* (*makeSniffer)();

@@ -15,16 +15,16 @@ namespace vendor::korvan::bex::wifi::V1_0::implementation {
 using ::android::hardware::hidl_string;
 using ::android::hardware::Return;
 
-// What drives the phone's chip. A WifiService sets them when it is made and resets them at its end;
-// they stay null when the phone names no known vendor. Calls on the binder threads read them
-// without a lock: they are set before the service is registered.
+// What drives the phone's chip. WifiService's constructor sets them, and its destructor resets
+// them; they stay null when the phone names no known vendor. Calls on the binder threads read them
+// without a lock, since they are set before the service is registered.
 extern VendorTestSuit* vendorTestSuit;
 extern SnifferTool* snifferTool;
 
 /**
- * The service object: hands every call to the suite or the sniffer controller of the phone's chip,
- * which it chooses from the properties ro.hardware.wlan.vendor and ro.hardware.wlan.chip when it is
- * made. A process makes one.
+ * The service object: hands every call to the suite or the sniffer controller of the phone's chip.
+ * Its constructor chooses them by the properties ro.hardware.wlan.vendor and ro.hardware.wlan.chip.
+ * A process makes one.
  *
  * Does not queue calls: two that overlap interleave their commands on the same radio. On a phone
  * whose vendor is unknown, a call that needs the missing object ends the process.

@@ -59,10 +59,10 @@ int runTable(Runner& runner, const CommandTable& table, const AfterRow& after = 
 
 /**
  * The same with every word in the line, and with each line in the log before it runs, as "<method>:
- * <line>". At error priority, so that it shows in a log that keeps nothing less.
+ * <line>". The priority is error, so that a log which keeps errors only has the line.
  *
- * A line that begins with "insmod" may fail. One that begins with a path, as "/vendor/bin/insmod"
- * does, may not.
+ * A line that begins with "insmod" may fail. A line that begins with a path, such as
+ * "/vendor/bin/insmod", may not.
  *
  * @param tag The runner's log tag.
  * @param method The operation's name, for the log.

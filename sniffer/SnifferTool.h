@@ -35,7 +35,7 @@ inline constexpr CaptureServices kByProperties = {
  */
 class SnifferTool {
   public:
-    /** What became of one command. */
+    /** The result of one command. */
     struct CmdRunResult {
         /** 0 when the command ran and ended with exit status 0, else -1. */
         int32_t status = -1;

@@ -12,7 +12,7 @@ namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 namespace {
 
-/** What the tool is given for a width, by the standard. */
+/** The option for a width, by the standard. */
 struct Width {
     int mhz;
     const char* n;
@@ -33,7 +33,7 @@ constexpr Width kModes[] = {
 constexpr Width kModeOf20MHz =
     {20, "1", "5"};
 
-// The tool takes 80 and 160 MHz in 802.11ac only.
+// The tool accepts 80 and 160 MHz only with 802.11ac.
 constexpr Width kOptions[] = {
 //  MHz   n       ac
     {40,  "-M 2", "-M 6"},

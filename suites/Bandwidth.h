@@ -7,17 +7,17 @@
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
-// How myftm takes the channel width, which comes in MHz ("40"). A width that the tool does not know
-// becomes 20 MHz.
+// The channel width, which comes in MHz ("40"), in the form that myftm expects. A width that the
+// tool does not know becomes 20 MHz.
 
 /**
  * The number after -M for an 802.11n (vht false) or 802.11ac (vht true) test, as the tool of the
- * firmware-path suites takes it. 80 MHz has one number for both.
+ * firmware-path suites expects it. 80 MHz has one number for both.
  */
 std::string bandwidthMode(const std::string& bandwidth, bool vht);
 
 /**
- * The option for an 802.11n or ac test, as the tool of the driver-path suites takes it; may be
+ * The option for an 802.11n or ac test, as the tool of the driver-path suites expects it; may be
  * several words. The 20 MHz option is logged as an error under `tag`, for 20 MHz as well.
  */
 std::string bandwidthOption(const std::string& bandwidth, bool vht, const char* tag);

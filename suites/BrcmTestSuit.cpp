@@ -29,7 +29,7 @@ const Command kStartTx       = {"wl", "pkteng_start", "00:11:22:33:44:55", "tx",
 const Command kStopTx        = {"wl", "pkteng_stop", "tx"};
 const Command kStartRx       = {"wl", "pkteng_start", "00:11:22:33:44:55", "rx"};
 
-// The chip counts the packets that its packet engine receives as pktengrxdmcast; the listing holds
+// The chip counts the packets that its packet engine receives as pktengrxdmcast; the listing has
 // every other counter too.
 const Command kReadCounter   = {"wl", "counters",
                                 " | busybox grep pktengrxdmcast | busybox awk "

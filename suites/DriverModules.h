@@ -11,8 +11,8 @@
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
-// How a suite finds its driver's module files, and the strings for that: each suite's unit has its
-// own.
+// How a suite finds its driver's module files, and the strings for that. Each suite's unit has its
+// own strings.
 
 /** The strings of a suite whose driver is one module file. */
 struct FirmwarePathStrings {
@@ -48,8 +48,8 @@ struct DriverPathStrings {
  * which the folder lists them, and logs each name as an error.
  *
  * @param tag The log tag of the caller.
- * @param driverPaths Gets the paths, after those that it has.
- * @return 0 when it then holds a path; -1 when not, or when the folder cannot be opened.
+ * @param driverPaths The paths are appended to it.
+ * @return 0 when it then has a path; -1 when not, or when the folder cannot be opened.
  */
 int listDriverPaths(const char* tag, const DriverPathStrings& strings,
                     std::vector<std::string>& driverPaths);

@@ -109,7 +109,7 @@ int DriverPathOperations::RunRxAxStart(const std::string& channel, const std::st
 }
 
 int DriverPathOperations::RunRxStop(const std::string& channel, std::string& out) {
-    // With its folder before it, insmod has to succeed.
+    // A line that calls insmod by its path must succeed.
     return runCommandList("RunRxStop", endAndReload(channel, mChip.endRx, "/vendor/bin/insmod"),
         AfterRow{1, [&](const std::string& output) {
             out = receivedText(mSuit, mTag, kCountField, output);

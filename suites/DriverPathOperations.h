@@ -11,7 +11,7 @@
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
-/** What tells one chip family from another whose driver is several module files. */
+/** How the chip families whose driver is several module files differ. */
 struct DriverPathChip {
     /** The option that chooses the chip's radios, before any test. */
     const char* radios;
@@ -34,7 +34,7 @@ inline constexpr DriverPathChip kWcn6750Chip = {"-B phya",  "0",     "0",    "-x
  * start reloads all of them in factory test mode and runs one myftm command, a stop reloads them
  * normally.
  *
- * Every line runs by the suite's runCmdCom, and is logged with the operation's name. A module that
+ * The suite's runCmdCom runs every line, which is logged with the operation's name. A module that
  * cannot be loaded fails RunRxStop only.
  */
 class DriverPathOperations {

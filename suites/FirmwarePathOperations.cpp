@@ -22,7 +22,7 @@ constexpr size_t kCountField = 1;
 
 // clang-format off
 
-// QCA transmits b/g with the options of a reception, and knows no power for it.
+// QCA transmits b/g with the options of a reception, which have no power.
 constexpr FirmwarePathChip kQcaChip = {
     /* tools     */ {"myftm", "rmmod", "insmod", "sleep",
                      "ifconfig", "iwlist", "iwconfig", "ping"},
@@ -125,7 +125,7 @@ int FirmwarePathOperations::RunRxAxStart(std::string& out) {
 }
 
 int FirmwarePathOperations::RunRxStop(std::string& out) {
-    // This one load names the tool's folder on every chip.
+    // This load names insmod's folder on every chip.
     return runTable(mSuit, {
         {mChip.tools.myftm, kEndRx},
         {mChip.tools.rmmod, "wlan.ko"},

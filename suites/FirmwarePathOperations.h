@@ -29,7 +29,7 @@ struct BgTransmission {
     std::string antenna, frequency, rateIndex, protocolIndex, power;
 };
 
-/** What tells one chip family from another whose driver is one module file. */
+/** How the chip families whose driver is one module file differ. */
 struct FirmwarePathChip {
     FirmwarePathTools tools;
     /** How the driver is loaded for a test; for a b/g reception always ThenTestMode. */
@@ -54,16 +54,16 @@ extern const FirmwarePathChip kWcn39xxChip;
  * start reloads the driver in factory test mode and runs one myftm command, a stop reloads it
  * normally.
  *
- * Every line runs by the suite's runCmdCom. myftm has two commands
- * that end a test: -t 0 is for transmissions, -x 0 for receptions.
+ * The suite's runCmdCom runs every line. myftm has two commands that end a test: -t 0 is for
+ * transmissions, -x 0 for receptions.
  */
 class FirmwarePathOperations {
   public:
     /**
      * @param suit The suite whose operations these are.
      * @param tag The suite's log tag.
-     * @param fwPath The driver's module file; empty when there is none, which ends the command that
-     *     loads it.
+     * @param fwPath The driver's module file; empty when there is none. The command that loads it
+     *     then ends at the empty word.
      */
     FirmwarePathOperations(VendorTestSuit& suit, const char* tag, const FirmwarePathChip& chip,
                            const std::string& fwPath);

@@ -11,7 +11,7 @@ namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
 namespace {
 
-/** The text from a place up to the end of a field, or up to its own end. */
+/** The text from a place up to the end of a field, or all the rest. */
 std::string upToField(const std::string& text, size_t start, size_t field) {
     size_t end = start;
     for (size_t i = 0; i <= field; ++i) {
@@ -36,7 +36,7 @@ std::string countWithout(VendorTestSuit& suit, const std::string& label,
 std::string goodPackets(VendorTestSuit& suit, const char* tag, size_t field,
                         const std::string& output) {
     const size_t label = output.rfind("goodPackets");
-    // There may be millions of fields after the one that is wanted.
+    // Not all fields are split off: there may be millions after the one that is wanted.
     std::string count = label == std::string::npos ? "" : upToField(output, label, field);
     try {
         count = suit.splitString(count, " ").at(field);

@@ -9,9 +9,9 @@
 
 namespace vendor::korvan::bex::wifi::V1_0::implementation {
 
-// What a reception tells the client. What a tool printed goes through the suite's string tools.
+// The texts that a reception returns to the client, made with the suite's string tools.
 
-/** What the start of a reception says: "ok" for status 0, else "failure". */
+/** The text after the start of a reception: "ok" for status 0, else "failure". */
 std::string startWord(int status);
 
 /**
@@ -23,8 +23,8 @@ std::string countWithout(VendorTestSuit& suit, const std::string& label, const s
 /**
  * The number of good packets in what myftm printed, after its newlines became blanks. The text from
  * the last "goodPackets" on is split at each blank; the number is one of its fields, counted from
- * 0. When there are fewer fields, an error is logged and the result is that whole text; without the
- * label it is empty.
+ * 0. When there are fewer fields, an error is logged and the result is that whole text. Without the
+ * label the result is empty.
  *
  *     goodPackets(suit, "wifi@1.0-example", 1, "goodPackets 12 badPackets 3 ") gives "12".
  *
@@ -33,7 +33,7 @@ std::string countWithout(VendorTestSuit& suit, const std::string& label, const s
 std::string goodPackets(VendorTestSuit& suit, const char* tag, size_t field,
                         const std::string& output);
 
-/** What the end of a reception says: "Rx: " and the good packets in what myftm printed. */
+/** The text after the end of a reception: "Rx: " and the good packets in what myftm printed. */
 std::string receivedText(VendorTestSuit& suit, const char* tag, size_t field,
                          const std::string& output);
 

@@ -38,8 +38,8 @@ void VendorTestSuit::runCmdCom(const std::string& cmd, CmdRunResult& result) {
     }
 }
 
-// The first occurrence is the one that ends first. So the text is read on up to where one may end;
-// one that does is taken off, and its replacement is read next.
+// The first occurrence is the one that ends first. So the text is read up to each place where an
+// occurrence may end. If one ends there, it is removed, and its replacement is read next.
 std::string VendorTestSuit::replaceSubString(const std::string& src, const std::string& from,
                                              const std::string& to) {
     const std::string backwards(to.rbegin(), to.rend());

@@ -15,15 +15,15 @@ namespace vendor::korvan::bex::wifi::V1_0::implementation {
  * The families that load every module of a folder tolerate an "insmod" that fails.
  *
  * Arguments are text and go into the command lines unchecked. IWifiService says which forms make
- * sense, and each class which arguments it does not use. Operations that take `out` leave there the
- * text for the client: a packet count or a status word.
+ * sense; each class says which arguments it does not use. Operations that take `out` leave there
+ * the text for the client: a packet count or a status word.
  *
  * A suite has no state of its own that an operation changes, so two threads may run two operations;
  * their commands then interleave on the same radio.
  */
 class VendorTestSuit {
   public:
-    /** What became of one command. */
+    /** The result of one command. */
     struct CmdRunResult {
         /** 0 when the command ran and ended with exit status 0, else -1. */
         int32_t status = -1;
@@ -88,15 +88,15 @@ class VendorTestSuit {
      * none: ("a-b-c", "-", " ") gives "a b c", ("aaaab", "ab", "b") gives "b". Takes time in
      * proportion to the text and the number of replacements.
      *
-     * Does not end when each replacement brings another occurrence: when `to` contains `from`, as
-     * it always does an empty one, and for some other pairs, such as "ab" by "bbaa".
+     * Never ends when each replacement makes another occurrence: when `to` contains `from` (an
+     * empty `from` is in every text), and for some other pairs, such as "ab" by "bbaa".
      */
     virtual std::string replaceSubString(const std::string& src, const std::string& from,
                                          const std::string& to);
 
     /**
      * Splits at every `sep`. A separator at the end adds no empty piece, one at the start and two
-     * in a row do: ("a  b ", " ") gives "a", "", "b". Does not end when `sep` is empty.
+     * in a row do: ("a  b ", " ") gives "a", "", "b". Never ends when `sep` is empty.
      */
     virtual std::vector<std::string> splitString(const std::string& str, const std::string& sep);
 };

@@ -27,7 +27,7 @@ const Command kUnload       = {"rmmod", "wlan.ko"};
 const Command kUnloadByTone = {"rmmod", "wlan"};
 const Command kReadCounter  = {"iwpriv wlan0", "get_rxpktcnt"};
 
-/** How the driver is told an 802.11n or ac channel: its bonding word and its rates. */
+/** An 802.11n or ac channel in the driver's words: the bonding and the rates. */
 struct BondedChannel {
     bool vht;
     int mhz;
