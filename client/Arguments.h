@@ -8,7 +8,7 @@
 #include <string>
 #include <vector>
 
-// The command line: options, which may stand before, between and after the words, and the words.
+// The command line: words, and options before, between and after them.
 
 namespace vendor::korvan::bex::wifi::client {
 
@@ -26,13 +26,12 @@ struct CommandLine {
 
 /**
  * Reads the options --help (-h), --version, --json, --require-count, --strict, --timeout SECONDS
- * and
- * --timeout=SECONDS. "--" ends the options.
- * "-" and negative decimal numbers such as "-20" and "-0.5" are words; anything else that begins
- * with "-" is an option. SECONDS is a decimal number, such as 2.5, above 0 and up to a million.
+ * and --timeout=SECONDS. "--" ends the options. "-" and negative decimal numbers such as "-20" and
+ * "-0.5" are words; anything else that begins with "-" is an option. SECONDS is a decimal number,
+ * such as 2.5, above 0 and up to a million.
  *
  * @param arguments The command line without the program's name.
- * @param problem On failure one line (without a newline) that tells what is wrong.
+ * @param problem On failure one line (without a newline) that says what is wrong.
  */
 bool readCommandLine(const std::vector<std::string>& arguments, CommandLine* line,
                      std::string* problem);

@@ -9,7 +9,7 @@
 namespace vendor::korvan::bex::wifi::client {
 namespace {
 
-/** What the worker tells of itself; the answer may be read when it is done. */
+/** What the worker reports. Read the answer only when the worker is done. */
 struct Shared {
     std::atomic<Stage> stage = Stage::lookup;
     bool found = false;

@@ -19,7 +19,7 @@ namespace vendor::korvan::bex::wifi::client {
 enum class Stage {
     /** The service has not been found: nothing was called. */
     lookup,
-    /** The call is on its way, and has no answer. */
+    /** The service was called, and has not answered. */
     call,
     /** The service answered. */
     done,
@@ -48,18 +48,18 @@ struct Outcome {
     int number = 0;
     /** When the search began. */
     std::chrono::system_clock::time_point started{};
-    /** From the begin of the search to the end of the call. */
+    /** From the start of the search to the end of the call. */
     std::chrono::nanoseconds duration{};
 };
 
-/** Sets the ending of what was not waited for to its end. */
+/** Sets the ending of a call that was not waited for. */
 void applyWait(const Waited& waited, Outcome* outcome);
 
 /**
  * Finds the service and makes the call. Returns when both are done, or, promptly, when the deadline
  * has passed or a signal has come.
  *
- * @param timeout The time for both; without one they may take as long as they like.
+ * @param timeout The time for both; without it they may take any time.
  */
 Outcome callService(const Request& request, const FindService& find,
                     std::optional<std::chrono::nanoseconds> timeout, const Progress& progress);

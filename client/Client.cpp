@@ -54,8 +54,7 @@ int conclude(const Surroundings& to, const std::string& text, const Report& repo
 }
 
 /**
- * Waits as `wait` does, which gets what to do meanwhile: where somebody watches, show how long it
- * has taken.
+ * Calls `wait` with what to do meanwhile: on a terminal, show how long the call has taken.
  */
 template <typename Wait>
 auto watched(const std::string& doing, const Surroundings& to, Wait wait) {

@@ -20,15 +20,15 @@ namespace vendor::korvan::bex::wifi::client {
 struct Surroundings {
     /** Gets the result and nothing else. */
     std::ostream& out;
-    /** Gets one line for each exit code but 0. */
+    /** Gets one line for each exit code except 0. */
     std::ostream& err;
     /** Looks for the service once. */
     FindService tryFind;
     /** Waits for a service that is declared but does not run yet. */
     FindService awaitFind;
-    /** Whether somebody watches err: then a slow call shows there how long it takes. */
+    /** Whether err is a terminal: then a slow call shows there how long it takes. */
     bool terminal = false;
-    /** How often that display moves on by one second; only a test has it other than a second. */
+    /** How often that display counts one second more; only tests change it. */
     std::chrono::nanoseconds second = std::chrono::seconds(1);
     /** Where the doctor looks. */
     PhoneView phone = {};

@@ -211,7 +211,7 @@ std::optional<bool> readFlag(const std::string& text) {
     return std::nullopt;
 }
 
-// Of letters, whatever their case, that are to be inserted, left out or replaced.
+// Letters to insert, to leave out or to replace, whatever their case.
 constexpr size_t kFarthestMisspelling = 3;
 
 /** The number of such letters; a higher one for texts that are far apart in length. */
@@ -243,7 +243,7 @@ std::string wrongCount(const Command& command, size_t given) {
            std::to_string(given);
 }
 
-/** The kernel takes 32 pages for one argument of a program, such as the shell's, with its NUL. */
+/** The kernel accepts 32 pages for one argument of a program, such as the shell's, with its NUL. */
 size_t longestCommandLine() {
     return 32 * static_cast<size_t>(getpagesize()) - 1;
 }

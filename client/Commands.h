@@ -29,11 +29,11 @@ struct ArgumentKind {
     const char* meaning;
     /** The unit of a measure; empty where there is none. */
     const char* unit;
-    /** The forms that the service makes sense of. Only a boolean is checked by the client. */
+    /** The forms that the service understands. The client checks booleans only. */
     const char* accepted;
     /** One of them. */
     const char* example;
-    /** Whether some chip makes sense of a text; null where nobody but the chip's tool can tell. */
+    /** Whether some chip knows a value; null where only the chip's tool can tell. */
     bool (*isKnown)(const std::string& text) = nullptr;
 };
 
@@ -59,7 +59,7 @@ struct Value {
     bool flag = false;
 };
 
-/** What came of a call. */
+/** The result of a call. */
 struct Answer {
     /** Whether the service answered; otherwise transportError tells why not. */
     bool delivered = false;
@@ -82,7 +82,7 @@ struct Command {
     const char* summary;
     std::vector<const ArgumentKind*> arguments;
     const ResultKind* result;
-    /** What goes on after the call, such as "the transmission"; empty where nothing does. */
+    /** What still runs after the call, such as "the transmission"; empty where nothing does. */
     const char* starts;
     /** Calls the method; takes as many values as there are arguments. Blocks until it answers. */
     Answer (*call)(IWifiService& service, const std::vector<Value>& values);
@@ -98,7 +98,7 @@ struct Request {
     std::vector<Value> values;
 };
 
-/** A line for each value that no chip makes sense of. It goes to the service all the same. */
+/** One line for each value that no chip knows. The values still go to the service. */
 std::vector<std::string> warningsOf(const Request& request);
 
 /** The sixteen methods in the interface's order. */
@@ -107,13 +107,13 @@ const std::vector<Command>& commands();
 /** The method of exactly this name, or null. */
 const Command* findCommand(const std::string& name);
 
-/** Tells, on one line and quoting the name, that there is no such method, and which is meant. */
+/** One line that says that there is no method of this name, and names the nearest one. */
 std::string unknownCommand(const std::string& name);
 
 /**
- * Reads a method's name and its arguments. Booleans are "true", "false", "1" or "0"; every other
- * argument is taken as it stands, the empty one and one that is not UTF-8 included, unless it is
- * too long for any command line.
+ * Reads a method's name and its arguments. Booleans are "true", "false", "1" or "0"; any text is
+ * accepted unchanged for the other arguments, also an empty one and one that is not UTF-8, unless
+ * it is too long for a command line.
  *
  * @param words The name, then the arguments in the interface's order.
  * @param problem On failure one line (without a newline) that tells what is wrong.

@@ -11,8 +11,8 @@
 namespace vendor::korvan::bex::wifi::client {
 
 /**
- * What the help of a method adds on a phone: its chip family, which arguments that ignores, and
- * what else surprises (chips/MethodUse.h). Ends in a newline.
+ * What the help of a method adds on a phone: the chip family, the arguments that it ignores, and
+ * what else a caller would not expect (chips/MethodUse.h). Ends in a newline.
  *
  * @param family Null for a phone that names no known vendor; then the text is empty.
  */

@@ -8,20 +8,21 @@
 
 #include "client/Commands.h"
 
-// What the client tells about itself, for people and, in JSON, for programs. All end in a newline.
+// The client's texts about itself, for people and, in JSON, for programs. All end in a newline.
 
 namespace vendor::korvan::bex::wifi::client {
 
-/** Of all the client's JSON; a change that could break a reader raises it. */
+/** The version of all the client's JSON; a change that could break a reader raises it. */
 constexpr char kSchemaVersion[] = "1";
 
-/** Of the whole client: how to call it, its subcommands and options, its exit codes. */
+/** The help on the whole client: how to call it, its subcommands and options, its exit codes. */
 std::string helpText();
 
-/** Of one method: each argument's meaning, unit and accepted text, the result, and an example. */
+/** The help on one method: its arguments' meaning, units and accepted texts, its result, an
+ * example. */
 std::string helpText(const Command& command);
 
-/** Of a subcommand that calls no single method: list, doctor, stop; nothing for other names. */
+/** The help on a subcommand that is no method: list, doctor, stop; nothing for other names. */
 std::optional<std::string> helpOnTopic(const std::string& name);
 
 /** The client's version, and the interface that it was built for. */

@@ -9,8 +9,8 @@
 
 #include "client/Commands.h"
 
-// The call of any of the interface's methods, by its parameters' types: a text and a flag take the
-// next word, a callback keeps what the method answers through it.
+// The call of any of the interface's methods, by its parameters' types: each text and each flag
+// takes the next word, a callback keeps the method's answer.
 
 namespace vendor::korvan::bex::wifi::client {
 

@@ -19,7 +19,7 @@ std::string inMilliseconds(std::chrono::nanoseconds duration) {
     return ::android::base::StringPrintf("%lld.%03lld", us / 1000, us % 1000);
 }
 
-/** As RFC 3339 has it, UTC. */
+/** In the form of RFC 3339, UTC. */
 std::string timestamp(std::chrono::system_clock::time_point time) {
     using namespace std::chrono;
     const auto ms = duration_cast<milliseconds>(time.time_since_epoch()).count();

@@ -14,8 +14,7 @@
 namespace vendor::korvan::bex::wifi::client {
 
 /**
- * What the client ends with. Its own codes are below 126, so that no shell mistakes one for its
- * own.
+ * The client's exit codes. Its own are below 126, so that none looks like one of the shell's.
  */
 enum ExitCode {
     kSuccess = 0,
@@ -32,7 +31,7 @@ enum ExitCode {
     kNotWritten = 6,
     /** The answer holds no count of packets, and one was required. */
     kNoCount = 7,
-    /** And the number of the signal that ended the wait for an answer, as shells have it. */
+    /** Plus the number of the signal that ended the wait for an answer, as shells count it. */
     kSignalled = 128,
 };
 
@@ -42,10 +41,10 @@ struct Report {
     std::string error;
 };
 
-/** Of a call that has no answer. `doing` is what it was, such as a method's name. */
+/** The failure of a call that has no answer. `doing` says what it was, such as a method's name. */
 Report judgeUnanswered(const std::string& doing, const Outcome& outcome);
 
-/** Of a call of a method. */
+/** The failure of a method's call. */
 Report judge(const Request& request, const Outcome& outcome);
 
 /** Whether the call may have started something that goes on. */
@@ -54,16 +53,16 @@ bool mayHaveStarted(const Request& request, const Outcome& outcome);
 /** "stop" with the channel where it is a plain number, as a command line to copy. */
 std::string stopCommandLine(const std::string& channel);
 
-/** The object that --json prints of a call, with a newline. */
+/** The object that --json prints for a call, with a newline. */
 std::string jsonReport(const Request& request, const Outcome& outcome, const Report& report);
 
-/** What the JSON objects of all calls begin with. */
+/** The members that begin the JSON objects of all calls. */
 JsonObject jsonHead(const std::string& method, const JsonObject& arguments, const Report& report);
 
 /**
- * The members that tell of the call's course.
+ * The members that say how the call went.
  *
- * @param mayBeOn Whether the radio may be on; nothing when the call does not tell.
+ * @param mayBeOn Whether the radio may be on; nothing when the call does not show it.
  */
 void addCourse(const Outcome& outcome, std::optional<bool> mayBeOn, JsonObject* object);
 

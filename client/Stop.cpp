@@ -18,7 +18,7 @@ constexpr int kPasses = 3;
 constexpr std::chrono::microseconds kBetweenQuestions(200);
 constexpr std::chrono::milliseconds kBetweenLooks(100);
 
-// What the answer 0 tells, by the lines that must have succeeded for it:
+// What the answer 0 proves, by the lines that must have succeeded for it:
 //
 //   broadcom      snifferStop   "ifconfig wlan0 down" ends the firmware, and every test with it.
 //                               RunTxStop and RunTxStStop do so too, and fail when nothing runs
@@ -28,7 +28,7 @@ constexpr std::chrono::milliseconds kBetweenLooks(100);
 //                               transmission
 //                 snifferStop   "echo 0" ends monitor mode
 //
-// RunRxStop proves nothing anywhere: its answer is a count, also after failed commands.
+// RunRxStop proves nothing on any chip: its answer is a count, also after failed commands.
 struct Proof {
     const char* family;
     std::vector<std::string> methods;
@@ -36,11 +36,11 @@ struct Proof {
 const std::vector<Proof> kProofs = {{"broadcom", {"snifferStop"}}};
 const std::vector<std::string> kProofOfOthers = {"RunTxStStop", "snifferStop"};
 
-// A question that is answered in less than this part of the time of the call beside it has not
-// waited for that call's end.
+// A question and a call run at the same time. If the answer takes less than this part of the call's
+// time, the question has not waited for the call's end.
 constexpr int kPromptly = 4;
 
-/** What the worker tells; the caller may give up at any time. */
+/** What the worker reports; the caller may give up at any time. */
 struct Shared {
     std::mutex lock;
     Stopped stopped;
@@ -91,7 +91,7 @@ class Work {
         });
     }
 
-    /** Asks the service until the work is done: the time that the slowest answer took. */
+    /** Asks the service until the work is done; returns the time of the slowest answer. */
     Clock::duration slowestAnswerDuring(std::function<void()> work) {
         Clock::duration slowest{};
         Worker worker(std::move(work));
@@ -149,7 +149,7 @@ class Work {
     const std::vector<std::string> mProof;
     const std::shared_ptr<Shared> mShared;
     sp<IWifiService> mService;
-    /** Why the service cannot be asked on; empty as long as it can. */
+    /** Why the service cannot be asked any more; empty as long as it can. */
     std::string mError;
 };
 

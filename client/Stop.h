@@ -8,14 +8,14 @@
 
 #include "client/Call.h"
 
-// `bex-wifi-client stop`: ends whatever runs, by the methods that exist, and tells whether the
-// radio is off.
+// `bex-wifi-client stop`: ends whatever runs, by calls of the interface's methods, and says whether
+// the radio is off.
 //
 // A stop proves nothing about a start that is still running, for its commands go on afterwards. The
 // service serves two calls at once and takes them in the order in which they come. So, while one of
-// our calls runs its commands, a question that needs none is answered at once, unless a third call
-// is there: then it waits for the end of ours. The calls are made once to find that out, and made
-// again when there is no other.
+// our calls runs its commands, the service answers a question that needs no command at once. Only
+// when there is a third call does it wait for the end of ours. We make the calls once to
+// find that out, and again when there is no other call.
 
 namespace vendor::korvan::bex::wifi::client {
 
@@ -28,24 +28,24 @@ struct StopCall {
 struct Stopped {
     /** Ending::answered when every call was answered, whatever it was. */
     Outcome outcome;
-    /** Whether the service was in no other call any more before these. */
+    /** Whether the service had finished all other calls before these. */
     bool alone = false;
-    /** Of the last time that all were made, in order. */
+    /** The last round of calls, in order. */
     std::vector<StopCall> calls;
     /** Whether the calls' answers prove that the radio is off. */
     bool off = false;
 };
 
 /**
- * The methods whose answer 0, of all of them, proves that the radio is off.
+ * The methods that prove the radio off when all of them answer 0.
  *
- * @param family The chip family's name; the strictest proof for one that is not known.
+ * @param family The chip family's name; an unknown one needs the strictest proof.
  */
 std::vector<std::string> proofOf(const std::string& family);
 
 /**
- * Makes the calls until the service is in no other call meanwhile, and then up to three times more,
- * until they prove that the radio is off.
+ * Makes the calls until the service is in no other call at the same time. Then makes them up to
+ * three times more, until they prove that the radio is off.
  *
  * @param channel The argument of the calls that take one.
  */

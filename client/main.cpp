@@ -15,8 +15,8 @@ using vendor::korvan::bex::wifi::client::runClient;
 
 namespace {
 
-// A standard stream that is closed would lend its number to the connection with the service, and
-// the result would go there. Opened the wrong way round, it still fails when it is used.
+// The connection with the service would get the number of a closed standard stream, and the result
+// would go there. So the stream is opened in the wrong direction: using it still fails.
 void occupyStandardStreams() {
     for (int fd = STDIN_FILENO; fd <= STDERR_FILENO; ++fd) {
         if (fcntl(fd, F_GETFD) == -1) open("/dev/null", fd == STDIN_FILENO ? O_WRONLY : O_RDONLY);
@@ -28,7 +28,7 @@ void occupyStandardStreams() {
 int main(int argc, char** argv) {
     occupyStandardStreams();
     signal(SIGPIPE, SIG_IGN);
-    // Where the platform logs to stderr, its lines would stand among the client's own, which tell
+    // Where the platform logs to stderr, its lines would appear among the client's own, which say
     // the same.
     __android_log_set_minimum_priority(ANDROID_LOG_SILENT);
     const std::vector<std::string> arguments(argv + (argc > 0), argv + argc);

@@ -27,7 +27,7 @@ std::string hexDigits(std::string_view bytes);
  */
 class JsonObject {
   public:
-    /** Adds a member whose value is JSON already. */
+    /** Adds a member whose value is already JSON. */
     JsonObject& add(std::string_view name, std::string_view json);
     /** Adds a member whose value is text. */
     JsonObject& addText(std::string_view name, std::string_view text);
@@ -41,7 +41,7 @@ class JsonObject {
 /** A JSON array, element by element. */
 class JsonArray {
   public:
-    /** Adds an element that is JSON already. */
+    /** Adds an element that is already JSON. */
     JsonArray& add(std::string_view json);
     std::string str() const { return "[" + mElements + "]"; }
 

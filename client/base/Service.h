@@ -11,7 +11,7 @@ namespace vendor::korvan::bex::wifi::client {
 
 using V1_0::IWifiService;
 
-/** Finds the service; null when there is none. It may take as long as it likes. */
+/** Finds the service; null when there is none. The search may take any time. */
 using FindService = std::function<::android::sp<IWifiService>()>;
 
 } // namespace vendor::korvan::bex::wifi::client

@@ -5,7 +5,7 @@
 
 namespace vendor::korvan::bex::wifi::client {
 
-/** Of the whole project; CHANGELOG.md tells what a version brought. */
+/** The version of the whole project; CHANGELOG.md says what each one changed. */
 constexpr char kVersion[] = "0.2.0";
 
 /** The interface that the client was built for, with its frozen hash. */

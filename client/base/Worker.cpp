@@ -20,7 +20,7 @@ using ::android::base::unique_fd;
 
 constexpr std::chrono::nanoseconds kLongestPoll = std::chrono::hours(1);
 
-/** As long as it lives, the signals that would kill the process wait to be taken. */
+/** While the object lives, the signals that would kill the process wait until it takes them. */
 class HeldSignals {
   public:
     HeldSignals() {
@@ -37,7 +37,7 @@ class HeldSignals {
     HeldSignals(const HeldSignals&) = delete;
     HeldSignals& operator=(const HeldSignals&) = delete;
 
-    /** Readable when there is one to take; -1 when there are no descriptors. */
+    /** Readable when a signal waits; -1 when there are no descriptors. */
     int fd() const { return mFd.get(); }
 
     int take() const {

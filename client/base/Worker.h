@@ -10,14 +10,14 @@
 #include <memory>
 #include <optional>
 
-// Work that cannot be broken off, such as a call of the service, and a wait for it that ends:
+// Work that cannot be interrupted, such as a call of the service, and a wait for it that can:
 //
 //     auto hash = ask<Reply<Hash>>(deadline, [service] { return servedHash(service); });
 //     if (!hash) return tooLate();
 //
-// Threads: the work runs on a thread of its own, and the caller's only waits. When the wait ends
-// first, that thread is left where it is. It may be inside of the platform's libraries, so the
-// process then ends with _exit, which leaves their static objects alone.
+// Threads: the work runs on a separate thread, and the caller's thread only waits. When the wait
+// ends first, the worker goes on. It may be inside the platform's libraries, so the process must
+// then end with _exit, which does not destroy their static objects.
 
 namespace vendor::korvan::bex::wifi::client {
 
@@ -26,7 +26,7 @@ using Clock = std::chrono::steady_clock;
 /** A deadline that never passes. */
 constexpr Clock::time_point kNever = Clock::time_point::max();
 
-/** Work on a thread of its own, which is left behind unless it is joined. */
+/** Work on a separate thread, which goes on by itself unless it is joined. */
 class Worker {
   public:
     explicit Worker(std::function<void()> work);
@@ -34,7 +34,7 @@ class Worker {
     Worker(const Worker&) = delete;
     Worker& operator=(const Worker&) = delete;
 
-    /** 0, or the errno that tells why there is no thread: the work has not begun. */
+    /** 0, or the errno that says why there is no thread: the work has not begun. */
     int error() const { return mError; }
     bool done() const;
     /** Readable when the work is done. */
@@ -75,21 +75,21 @@ struct Waited {
     };
 
     End end;
-    /** The signal that came, or the errno that tells why there is no thread. */
+    /** The signal that came, or the errno that says why there is no thread. */
     int number = 0;
 };
 
 /**
- * Does the work on a thread of its own, and waits for it.
+ * Does the work on a separate thread, and waits for it.
  *
  * While it waits, SIGINT and SIGTERM do not kill the process but end the wait, except where the
  * process ignores them.
  *
- * @param work Owns what it uses, since it may outlive the wait.
+ * @param work Must own everything that it uses: it may still run after the wait has ended.
  */
 Waited waitFor(std::function<void()> work, Clock::time_point deadline, const Progress& progress);
 
-/** The answer to a question that may block for ever; nothing when it has not come in time. */
+/** The answer to a question that may block for ever; nothing when it does not come in time. */
 template <typename Result>
 std::optional<Result> ask(Clock::time_point deadline, std::function<Result()> question) {
     const auto answer = std::make_shared<std::optional<Result>>();

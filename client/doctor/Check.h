@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-// What `bex-wifi-client doctor` finds out, and how it tells it.
+// What `bex-wifi-client doctor` finds out, and how it prints it.
 
 namespace vendor::korvan::bex::wifi::client {
 
@@ -17,13 +17,13 @@ enum class Verdict {
     unknown,
 };
 
-/** One thing that was looked at. Each text is one line. */
+/** The result of one check. Each text is one line. */
 struct Check {
     std::string name;
     Verdict verdict;
     /** What is there, or what is wrong. */
     std::string found;
-    /** What to do about a problem, or where else to look; empty when it is ok. */
+    /** What to do about a problem, or where else to look; empty when the check is ok. */
     std::string remedy;
 };
 

@@ -13,24 +13,24 @@
 #include "client/base/Service.h"
 #include "client/doctor/Check.h"
 
-// `bex-wifi-client doctor`: which of the things that keep a client from using the service can be
-// seen from where the client runs.
+// `bex-wifi-client doctor`: looks for what keeps a client from using the service, as far as the
+// client can see it.
 
 namespace vendor::korvan::bex::wifi::client {
 
-/** Where the doctor looks; what stands here is the phone that it runs on. */
+/** Where the doctor looks; the defaults are the phone that it runs on. */
 struct PhoneView {
     std::function<::android::sp<::android::hidl::manager::V1_0::IServiceManager>()> serviceManager =
             ::android::hardware::defaultServiceManager;
-    /** What every path begins with; only a test has it other than empty. */
+    /** The beginning of every path; only a test sets it. */
     std::string root;
 };
 
 /**
- * Makes all checks, in the order in which problems are to be mended.
+ * Makes all checks, in the order in which problems should be solved.
  *
- * Returns at the latest when the timeout has passed, and the time that the files take. A question
- * that is not answered by then leaves a thread behind, as a late call does (see base/Worker.h).
+ * Takes at most the timeout and the time for reading files. A question that has no answer by then
+ * leaves its thread running, as a late call does (see base/Worker.h).
  *
  * @param timeout The time for the service manager and the service, together.
  */

@@ -34,8 +34,8 @@ constexpr char kInsmodDenied[] =
         "; when insmod is refused, the service lacks the capability sys_module, or \"module_load\" "
         "for the file's label: logcat | grep avc";
 
-// Where the service's shell looks for a bare name, as the init script says. What lies outside of
-// the first ones a vendor process may not execute, unless its policy makes an exception.
+// Where the service's shell looks for a bare name, as the init script says. A vendor process may
+// execute only programs in the vendor's own folders, unless its policy makes an exception.
 constexpr const char* kVendorFolders[] = {"/vendor/bin/", "/vendor/xbin/", "/odm/bin/"};
 constexpr const char* kOtherFolders[] = {"/system/bin/", "/system/xbin/"};
 

@@ -20,7 +20,7 @@ struct FileState {
     off_t size;
 
     bool exists() const { return error == 0; }
-    /** Nobody can tell from here: something other than its absence kept it from being seen. */
+    /** It cannot be seen, for another reason than that it is missing. */
     bool hidden() const;
     bool hasContent() const { return exists() && S_ISREG(mode) && size > 0; }
     bool executable() const { return exists() && S_ISREG(mode) && (mode & 0111) != 0; }
@@ -41,11 +41,11 @@ Folder listFolder(const std::string& path);
 
 /** Entries of VINTF files that name a HAL's package. */
 struct Mentions {
-    /** The files, each once for every entry. */
+    /** The files, each as often as it has entries. */
     std::vector<std::string> files;
     /** How many files were read. */
     size_t read = 0;
-    /** One that is there and could not be read; empty when there is none. */
+    /** A file that exists and could not be read; empty when there is none. */
     std::string hidden;
 };
 
@@ -56,7 +56,7 @@ struct FileSet {
 };
 
 /**
- * Looks for `<name>package</name>` in the text of the files, comments left out.
+ * Looks for `<name>package</name>` in the text of the files, outside of comments.
  *
  * @param root The folder that stands for the phone's "/"; the result leaves it out.
  */

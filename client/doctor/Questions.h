@@ -9,8 +9,8 @@
 
 #include "client/base/Service.h"
 
-// What the doctor asks the service manager and the service. All but ownHash() may block for ever,
-// so each is asked on a worker thread (see base/Worker.h).
+// What the doctor asks the service manager and the service. All except ownHash() may block for
+// ever, so ask each on a worker thread (see base/Worker.h).
 
 namespace vendor::korvan::bex::wifi::client {
 
@@ -18,7 +18,7 @@ using Transport = ::android::hidl::manager::V1_0::IServiceManager::Transport;
 
 constexpr char kInstance[] = "default";
 
-/** What came of one transaction. */
+/** The result of one transaction. */
 template <typename Value>
 struct Reply {
     /** Why there is no value; empty when there is one. */
@@ -33,7 +33,7 @@ using Hash = std::string;
 Reply<Transport> declaredTransport(
         const ::android::sp<::android::hidl::manager::V1_0::IServiceManager>& manager);
 
-/** Pings the service: empty when it answers, else why it does not. */
+/** Pings the service: an empty text when it answers, otherwise the reason why not. */
 std::string pingError(const ::android::sp<IWifiService>& service);
 
 /** The hash that the service was built with. */

@@ -11,7 +11,7 @@ namespace vendor::korvan::bex::wifi::client {
  * Checks what VINTF says about the service, whether it runs, and whether it is the one that this
  * client was built for.
  *
- * @param timeout As of examine().
+ * @param timeout As for examine().
  */
 Checks checkService(const FindService& tryFind, const PhoneView& phone,
                     std::chrono::nanoseconds timeout);
