@@ -18,8 +18,10 @@ constexpr char kSchemaVersion[] = "1";
 /** The help on the whole client: how to call it, its subcommands and options, its exit codes. */
 std::string helpText();
 
-/** The help on one method: its arguments' meaning, units and accepted texts, its result, an
- * example. */
+/**
+ * The help on one method: its arguments' meaning, units and accepted texts, its result, an
+ * example.
+ */
 std::string helpText(const Command& command);
 
 /** The help on a subcommand that is no method: list, doctor, stop; nothing for other names. */

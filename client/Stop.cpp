@@ -22,10 +22,9 @@ constexpr std::chrono::milliseconds kBetweenLooks(100);
 //
 //   broadcom      snifferStop   "ifconfig wlan0 down" ends the firmware, and every test with it.
 //                               RunTxStop and RunTxStStop do so too, and fail when nothing runs
-//   the others    RunTxStStop   "rmmod wlan" ends the driver, and every test with it; what is
-//   loaded
-//                               afterwards starts in normal mode. On wcn RunTxStop only ends the
-//                               transmission
+//   the others    RunTxStStop   "rmmod wlan" ends the driver, and every test with it; the driver
+//                               that is loaded afterwards starts in normal mode. On wcn RunTxStop
+//                               only ends the transmission
 //                 snifferStop   "echo 0" ends monitor mode
 //
 // RunRxStop proves nothing on any chip: its answer is a count, also after failed commands.

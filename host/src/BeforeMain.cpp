@@ -8,8 +8,8 @@
 namespace android::hardware::host {
 namespace {
 
-// init starts its services without it. Where children's deaths are ignored, pclose() cannot tell
-// how a command ended, and some programs start others like this.
+// Sets SIGCHLD back to the default, as init does for its services. Some programs start others with
+// SIGCHLD ignored, and then pclose() cannot tell how a command ended.
 void stopIgnoringChildren() {
     struct sigaction inherited = {};
     sigaction(SIGCHLD, nullptr, &inherited);

@@ -8,10 +8,10 @@ namespace android::hardware::host {
 /** Sets the properties of /vendor/build.prop. */
 void seedProperties();
 
-/** Has the log begin at the priority that the property log.tag names. */
+/** Sets the lowest priority that is logged to the one that the property log.tag names. */
 void setLogLevel();
 
-/** Keeps a log that goes into a pipe which nobody reads any more from ending the process. */
+/** Keeps the process alive when its log goes into a pipe that nobody reads any more. */
 void outliveLogReader();
 
 } // namespace android::hardware::host

@@ -18,7 +18,7 @@ status_t BHwBinder::transact(uint32_t code, const Parcel& data, Parcel* reply, u
     });
 }
 
-// A process does not outlive itself.
+// No notice is needed: the object and the recipient die together.
 status_t BHwBinder::linkToDeath(const sp<DeathRecipient>& /*recipient*/, void* /*cookie*/,
                                 uint32_t /*flags*/) {
     return INVALID_OPERATION;

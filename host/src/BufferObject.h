@@ -18,7 +18,10 @@ struct BufferObject {
     /** The memory's address; on the wire 1, or 0 for null. */
     uint64_t buffer = 0;
     uint64_t length = 0;
-    /** The index of an earlier object, in whose memory, at parentOffset, stands the address. */
+    /**
+     * The index of an earlier object, which has this buffer's address in its memory at
+     * parentOffset.
+     */
     uint64_t parent = 0;
     uint64_t parentOffset = 0;
 };

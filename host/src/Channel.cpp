@@ -74,7 +74,7 @@ bool bringsDescriptors(int socket) {
     return size >= 0 && (head.msg_flags & MSG_CTRUNC) != 0;
 }
 
-/** Whether to read a file, and to close it, keeps a thread waiting for nobody. */
+/** Whether a thread can read and close a file without waiting for another process. */
 bool isInMemory(int file) {
     return fcntl(file, F_GET_SEALS) >= 0;
 }
@@ -115,7 +115,7 @@ status_t sendFrame(int socket, FrameHeader header, const Parcel* parcel, int fla
 
 Receipt FrameReader::receive(int flags, FrameHeader* header, Parcel* parcel) {
     if (mAwaitsPayload) return receiveBeside(flags, header, parcel);
-    // To take the message would close them, for which the thread might have to wait.
+    // Taking the message would close them, and the thread might have to wait for that.
     if ((flags & MSG_DONTWAIT) != 0 && bringsDescriptors(mSocket)) return Receipt::kMalformed;
 
     alignas(8) uint8_t message[kMaxInlineFrame];

@@ -9,9 +9,9 @@
 
 namespace android::hardware::host {
 
-// Frames over a SOCK_SEQPACKET socket: one frame is one message, so none ever arrives in halves.
-// After a frame whose payload is too long for a message comes a second message, of one byte, which
-// brings the payload as the descriptor of a memory file.
+// Frames over a SOCK_SEQPACKET socket: one frame is one message, so no frame arrives in parts. When
+// a payload is too long for a message, a second message follows the frame, of one byte, which
+// carries the descriptor of a memory file with the payload.
 
 /**
  * Sends a frame with the parcel, or without a payload when it is null.
@@ -50,7 +50,7 @@ class FrameReader {
     Receipt receiveBeside(int flags, FrameHeader* header, Parcel* parcel);
 
     const int mSocket;
-    // Between a frame's message and the one with its payload.
+    // Set between a frame's message and the one with its payload.
     bool mAwaitsPayload = false;
     FrameHeader mAnnounced;
 };

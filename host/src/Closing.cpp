@@ -14,7 +14,7 @@
 namespace android::hardware::host {
 namespace {
 
-/** Its thread lives while there is something to close. */
+/** Its thread runs while there is something to close. */
 class Closer {
   public:
     static Closer& get() {
@@ -31,7 +31,7 @@ class Closer {
             std::thread([this] { run(); }).detach();
             mRunning = true;
         } catch (const std::system_error&) {
-            // No thread to be had: it stays open until the next one comes.
+            // No thread can be started: it stays open until the next one comes.
         }
     }
 
@@ -54,14 +54,14 @@ class Closer {
     }
 
     std::mutex mMutex;
-    // The first one stands for the one that is being closed.
+    // The first one is the one that is being closed.
     std::deque<base::unique_fd> mWaiting;
     bool mRunning = false;
 };
 
 /** Whether a socket that is shut down has no message left. */
 bool isDrained(int socket) {
-    // An empty message and the end look alike, but only a message brings its sender's credentials.
+    // An empty message and the end look alike, but only a message has its sender's credentials.
     const int on = 1;
     if (setsockopt(socket, SOL_SOCKET, SO_PASSCRED, &on, sizeof(on)) != 0) return false;
     alignas(cmsghdr) char control[CMSG_LEN(sizeof(ucred))];

@@ -7,16 +7,16 @@
 
 #include <cstddef>
 
-// Closing a descriptor takes as long as its maker likes: a TCP socket that lingers waits for its
-// other end. The same goes for a socket with messages that nobody has taken, as they may bring such
-// descriptors. So nothing of another process is closed on a thread that serves calls.
+// The process that made a descriptor can delay its closing: a TCP socket that lingers waits for its
+// other end. The same is true of a socket with unread messages, as they may carry such descriptors.
+// So a thread that serves calls never closes a descriptor of another process.
 
 namespace android::hardware::host {
 
 /** Closes another process's descriptor, now or later, on a thread that does nothing else. */
 void closeElsewhere(base::unique_fd descriptor);
 
-/** Ends the connection with another process, and closes it here when that costs nothing. */
+/** Ends the connection with another process, and closes it on this thread when that cannot wait. */
 void closeConnection(base::unique_fd socket);
 
 /** How many descriptors closeElsewhere() has not closed yet. */

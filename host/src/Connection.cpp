@@ -33,7 +33,8 @@ void Listener::onReady(uint32_t /*events*/) {
         if (!client.ok()) {
             if (errno == ECONNABORTED) continue;
             if (errno == EAGAIN) return;
-            // Out of descriptors, say: the client waits. Nobody announces it a second time.
+            // For example no descriptor is free: the client waits. epoll does not announce it a
+            // second time.
             if (!mRefused.exchange(true)) ALOGE("accept: %s", strerror(errno));
             return Engine::get().retry(id());
         }
@@ -70,14 +71,15 @@ void Connection::onReady(uint32_t events) {
             return close();
         }
         const bool oneway = (header.flags & FrameHeader::kOneway) != 0;
-        // Who gave up while the call waited for a thread does not want it to begin now.
+        // A client that gave up while its call waited for a thread does not want it to begin now.
         if (!oneway && (events & EPOLLHUP) != 0) continue;
         if (receipt == Receipt::kFrame) {
             serve(header, &request);
         } else if (!oneway) {
             answer(FAILED_TRANSACTION, nullptr);
         }
-        // The answer gave the connection up; without one it is still this thread's.
+        // Sending the answer gave up the ownership; without an answer this thread is still the
+        // owner.
         if (!oneway) return;
     }
 }
@@ -85,7 +87,7 @@ void Connection::onReady(uint32_t events) {
 bool Connection::own() {
     State state = State::kIdle;
     if (mState.compare_exchange_strong(state, State::kOwned)) return true;
-    // Tells the owner, unless it has just let go, and then there is no owner to tell.
+    // Leaves a mark for the owner, unless the owner has just let go.
     while (!mState.compare_exchange_weak(state, state == State::kIdle ? State::kOwned
                                                                       : State::kOwnedAndReady)) {
     }
@@ -124,7 +126,8 @@ void Connection::answer(status_t status, const Parcel* reply) {
     header.flags = FrameHeader::kReply;
     header.status = status;
     disown();
-    // A client has one call under way, so its socket has room; one that lets it fill is not served.
+    // A client has one call under way, so its socket has room. A client that lets it fill is not
+    // served.
     status_t sent = sendFrame(socket(), header, reply, MSG_DONTWAIT);
     if (sent == FAILED_TRANSACTION) {
         header.status = FAILED_TRANSACTION;
@@ -134,8 +137,8 @@ void Connection::answer(status_t status, const Parcel* reply) {
 }
 
 void Connection::close() {
-    // Also tells a client that is still there; the descriptor itself may be in another thread's
-    // use.
+    // This also notifies a client that is still there. Another thread may be using the descriptor,
+    // so it is not closed here.
     shutdown(socket(), SHUT_RDWR);
     Engine::get().remove(id());
 }

@@ -17,9 +17,12 @@ class DeathWatch {
   public:
     static DeathWatch& get();
 
-    /** Has the function called, once, on the watcher's thread when the socket hangs up. */
+    /** Calls the function once, on the watcher's thread, when the socket hangs up. */
     uint64_t watch(int socket, std::function<void()> onHangup);
-    /** Comes before the socket is closed. A call that has begun is not waited for. */
+    /**
+     * Call it before the socket is closed. It does not wait for a function that is already
+     * running.
+     */
     void unwatch(uint64_t id, int socket);
 
   private:

@@ -20,10 +20,10 @@
 namespace android::hardware::host {
 namespace {
 
-// Edge-triggered: a connection costs no call to re-arm it, and wakes one thread, not all.
+// Edge-triggered: a connection needs no call to re-arm it, and wakes one thread instead of all.
 constexpr uint32_t kEvents = EPOLLIN | EPOLLRDHUP | EPOLLET;
 constexpr itimerspec kRetryDelay = {.it_interval = {}, .it_value = {0, 100'000'000}};
-// What epoll tells of the timer; the endpoints' names begin above it.
+// The timer's number in epoll; the endpoints' numbers begin above it.
 constexpr uint64_t kRetryTimer = 0;
 
 size_t halfOfDescriptorLimit() {

@@ -24,15 +24,15 @@ class Endpoint {
     Endpoint& operator=(const Endpoint&) = delete;
 
     /**
-     * There is something to read since the last time. Called on any of the threads, also on two at
-     * once. Reads until there is nothing, or sees to it that it is called again.
+     * There is new input. May be called on any of the threads, also on two at once. Reads until
+     * there is nothing left, or makes sure that it is called again.
      *
-     * @param events What epoll tells of the socket at this moment, 0 when it was not asked.
+     * @param events What epoll reports about the socket, 0 when it was not asked.
      */
     virtual void onReady(uint32_t events) = 0;
 
     int socket() const { return mSocket.get(); }
-    /** Its name in the engine, never used twice. */
+    /** Its number in the engine, never used twice. */
     uint64_t id() const { return mId; }
 
   private:
@@ -60,11 +60,11 @@ class Engine {
     void add(const std::shared_ptr<Endpoint>& endpoint);
     /** Ends the serving; the socket closes when the last thread that uses the endpoint is done. */
     void remove(uint64_t id);
-    /** remove(), after a last look at what has already come. */
+    /** As remove(), but first handles the input that has already come. */
     void retire(uint64_t id);
-    /** Has onReady() called again if there is still something to read. */
+    /** Makes the engine call onReady() again if there is still something to read. */
     void rearm(const Endpoint& endpoint);
-    /** Has onReady() called again in a moment, for what cannot be done just now. */
+    /** Makes the engine call onReady() again a little later, for what is impossible now. */
     void retry(uint64_t id);
     /** Whether one more connection would leave the process too few descriptors for its own work. */
     bool isFull();
@@ -77,7 +77,7 @@ class Engine {
     void retryAll();
 
     const base::unique_fd mEpoll;
-    // In the epoll instance too: at the moment of need there may be no descriptor for it.
+    // It is in the epoll instance from the start, since later there may be no descriptor for it.
     const base::unique_fd mRetryTimer;
     const size_t mMaxEndpoints;
 

@@ -72,7 +72,7 @@ status_t ParcelAccess::measure(const Parcel& parcel, FrameHeader* header) {
     for (size_t i = 0; i < offsets.size(); ++i) {
         const BufferObject object = objectAt(data, offsets[i]);
         if (!hasValidParent(object, data, offsets.data(), i)) return FAILED_TRANSACTION;
-        // Before the sum, which it could wrap.
+        // This check comes before the sum, which could overflow.
         if (carriedLength(object) > kTransactionBufferSize) return FAILED_TRANSACTION;
         buffers += pad8(carriedLength(object));
         if (buffers > kTransactionBufferSize) return FAILED_TRANSACTION;
@@ -96,7 +96,7 @@ void ParcelAccess::serialise(const Parcel& parcel, const FrameHeader& header, ui
         const auto* bytes = reinterpret_cast<const uint8_t*>(object.buffer);
         buffers.push_back(out);
         out = put(out, bytes, carriedLength(object));
-        // This process's addresses are nobody else's business.
+        // No other process gets to see the addresses in this one.
         if (object.hasParent != 0) {
             memset(buffers[object.parent] + object.parentOffset, 0, sizeof(object.buffer));
         }

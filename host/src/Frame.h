@@ -47,7 +47,7 @@ struct FrameHeader {
     /** What the payload takes of the receiver's transaction buffer, counted as the phone's driver.
      */
     size_t accountedSize() const;
-    /** Whether the numbers can belong together: to be asked before any of them is used. */
+    /** Whether the numbers are consistent. Check this before you use any of them. */
     bool isPlausible() const;
 };
 static_assert(sizeof(FrameHeader) == 32, "both ends agree on 32 bytes");
@@ -55,7 +55,7 @@ static_assert(sizeof(FrameHeader) == 32, "both ends agree on 32 bytes");
 /** Longest message that carries its payload itself. Any socket buffer takes it in one piece. */
 constexpr size_t kMaxInlineFrame = 16'384;
 
-/** The transport's door to a parcel's inside. */
+/** Gives the transport access to a parcel's members. */
 struct ParcelAccess {
     /**
      * Fills the header's three sizes. FAILED_TRANSACTION when the parcel is larger than the
@@ -68,7 +68,8 @@ struct ParcelAccess {
 
     /**
      * Turns a payload that came from another process into a parcel to read from: checks all of it,
-     * then sets the addresses that it implies. False, and the parcel empty, when it is malformed.
+     * then sets the addresses that it implies. When it is malformed, the result is false and the
+     * parcel empty.
      */
     static bool adopt(const FrameHeader& header, ReceivedBuffer&& payload, Parcel* parcel);
 

@@ -16,8 +16,8 @@ namespace android::hardware::host {
 namespace {
 
 /**
- * Keeps SIGPIPE from this thread while the object lives. To ignore the signal, or to block it for
- * good, would pass on to the tools that the process starts.
+ * Blocks SIGPIPE for this thread while the object lives. If the process ignored the signal, or
+ * blocked it for good, the tools that it starts would inherit that.
  */
 class PipeSignalBlock {
   public:

@@ -7,10 +7,13 @@
 
 namespace android::hardware::host {
 
-/** The folder that stands for the phone's "/": the environment's HIDL_HOST_ROOT, usually empty. */
+/**
+ * The folder that takes the place of the phone's "/": the environment's HIDL_HOST_ROOT, usually
+ * empty.
+ */
 std::string hostRoot();
 
-/** Where the registered instances' sockets lie. */
+/** The folder of the registered instances' sockets. */
 inline std::string socketFolder() {
     return hostRoot() + "/dev/socket/hidl";
 }

@@ -60,7 +60,7 @@ void addFqname(const std::string& fqname, const Wanted& wanted, Instances* found
     const size_t colons = fqname.find("::");
     const size_t slash = fqname.find('/');
     if (colons == std::string::npos || slash == std::string::npos || fqname[0] != '@') return;
-    // No version holds a slash, so the slash is behind the colons from here on.
+    // No version has a slash, so from here on the slash comes after the colons.
     if (!covers(fqname.substr(1, colons - 1), wanted)) return;
     if (fqname.substr(colons + 2, slash - colons - 2) != wanted.interface) return;
     found->insert(fqname.substr(slash + 1));

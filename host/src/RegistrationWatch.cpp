@@ -19,7 +19,7 @@ namespace android::hardware::host {
 namespace {
 
 // The kernel takes tens of milliseconds to close an inotify instance, so the process keeps the last
-// one that it was done with.
+// one that it used.
 std::mutex gMutex;
 base::unique_fd& spare() {
     static auto& spare = *new base::unique_fd;
@@ -34,11 +34,11 @@ RegistrationWatch::RegistrationWatch() {
         mNotices = std::move(spare());
     }
     if (!mNotices.ok()) mNotices.reset(inotify_init1(IN_CLOEXEC | IN_NONBLOCK));
-    // Until the first registration of all there is no folder: its making is news as well.
+    // Before the very first registration there is no folder, so its creation counts as well.
     for (const std::string& folder : {hostRoot() + "/dev/socket", socketFolder()}) {
         inotify_add_watch(mNotices.get(), folder.c_str(), IN_CREATE | IN_MOVED_TO);
     }
-    // Of a former use, or told anew by what the caller is about to see.
+    // Events of an earlier use, or of what the caller is about to see anyway.
     alignas(inotify_event) char old[4096];
     while (read(mNotices.get(), old, sizeof(old)) > 0) {
     }

@@ -9,15 +9,17 @@
 
 namespace android::hardware::host {
 
-/** Notices registrations from its making on, so that one made between a look and a wait is not
- * lost. */
+/**
+ * Notices registrations from its construction on, so that one between a lookup and a wait is not
+ * lost.
+ */
 class RegistrationWatch {
   public:
     RegistrationWatch();
     ~RegistrationWatch();
     RegistrationWatch(const RegistrationWatch&) = delete;
     RegistrationWatch& operator=(const RegistrationWatch&) = delete;
-    /** Returns after a registration, or when the time is over: true for the first. */
+    /** Returns after a registration, with true, or when the time has passed, with false. */
     bool wait(std::chrono::milliseconds timeout);
 
   private:

@@ -30,7 +30,7 @@ std::string temporaryPath() {
     return socketFolder() + "/." + std::to_string(getpid()) + "-" + std::to_string(count++);
 }
 
-/** Binds under a name of its own; a name that a killed process left behind is passed over. */
+/** Binds under a name of its own; skips a name that a killed process has left. */
 status_t bindTemporarily(int socket, std::string* path) {
     for (int attempts = 0; attempts < 100; ++attempts) {
         *path = temporaryPath();
@@ -48,7 +48,7 @@ status_t listenAt(const std::string& path, base::unique_fd* listener, FileIdenti
     sockaddr_un address;
     status_t result = socketAddress(path, &address);
     if (result != OK) return result;
-    // Its parent is the system's to make: on a phone, init's.
+    // The system makes its parent folder: on a phone, init does.
     if (mkdir(socketFolder().c_str(), 0755) != 0 && errno != EEXIST) return -errno;
 
     base::unique_fd socket(::socket(AF_UNIX, SOCK_SEQPACKET | SOCK_CLOEXEC | SOCK_NONBLOCK, 0));
@@ -100,7 +100,7 @@ status_t Registry::add(const std::string& path, const sp<hidl::base::V1_0::IBase
 sp<hidl::base::V1_0::IBase> Registry::find(const FileIdentity& socket) {
     std::lock_guard<std::mutex> lock(mMutex);
     for (const auto& [path, entry] : mEntries) {
-        // The time changed with the rename. The number is not given away while the socket listens.
+        // The rename has changed the time. The number is not reused while the socket listens.
         if (entry.socket.device == socket.device && entry.socket.inode == socket.inode) {
             return entry.object;
         }

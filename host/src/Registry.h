@@ -21,8 +21,8 @@ class Registry {
     static Registry& get();
 
     /**
-     * Makes a local object reachable at the path, in place of whatever was there. The engine serves
-     * it from then on.
+     * Makes a local object reachable at the path, in place of what was there before. The engine
+     * serves it from then on.
      */
     status_t add(const std::string& path, const sp<hidl::base::V1_0::IBase>& object,
                  const sp<BHwBinder>& stub);

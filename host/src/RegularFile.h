@@ -9,8 +9,9 @@
 namespace android::hardware::host {
 
 /**
- * A configuration file's content. Nothing when there is no file, and, with a line in the log, when
- * it cannot be read or is not a regular file: one of another kind might keep its reader waiting.
+ * A configuration file's content. Nothing when there is no file. Also nothing, with a line in the
+ * log, when it cannot be read or is not a regular file: another kind of file might keep its reader
+ * waiting.
  */
 std::optional<std::string> readRegularFile(const std::string& path);
 

@@ -15,12 +15,12 @@
 namespace android::hardware::host {
 namespace {
 
-/** The answer that has come, or, without MSG_DONTWAIT, that comes. */
+/** Receives the answer; waits for it unless MSG_DONTWAIT is set. */
 status_t receiveReply(int connection, int flags, Parcel* reply) {
     FrameReader reader(connection);
     FrameHeader header;
     Receipt receipt = reader.receive(flags, &header, reply);
-    // The socket tells first that the server has hung up, then what it had said.
+    // The socket reports the hang-up first, and then what the server had sent before it.
     if (receipt == Receipt::kClosed) receipt = reader.receive(MSG_DONTWAIT, &header, reply);
     if (receipt == Receipt::kNoRoom) return FAILED_TRANSACTION;
     const bool answered = receipt == Receipt::kFrame && (header.flags & FrameHeader::kReply) != 0;
@@ -29,7 +29,7 @@ status_t receiveReply(int connection, int flags, Parcel* reply) {
 
 status_t call(int connection, const FrameHeader& header, const Parcel& data, Parcel* reply) {
     const status_t sent = sendFrame(connection, header, &data, 0);
-    // A server that does not take it may have said why.
+    // A server that does not take the call may have sent the reason.
     if (sent == DEAD_OBJECT) return receiveReply(connection, MSG_DONTWAIT, reply);
     if (sent != OK || (header.flags & FrameHeader::kOneway) != 0) return sent;
     return receiveReply(connection, 0, reply);

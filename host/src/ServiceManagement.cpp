@@ -61,8 +61,9 @@ namespace details {
 namespace {
 
 /**
- * What stands behind the name now. A remote object is asked for its interfaces, so this waits for a
- * thread of a busy service, and for one that has registered and does not serve yet.
+ * The object that has the name now. A remote object is asked for its interfaces, so this waits
+ * until a busy service has a thread free, and until a service that has just registered begins to
+ * serve.
  */
 sp<IBase> lookUp(const std::string& path, const std::string& descriptor) {
     host::FileIdentity identity;

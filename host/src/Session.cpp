@@ -18,11 +18,10 @@
 namespace android::hardware::host {
 namespace {
 
-// More calls of one client than this wait here instead of at the server, which runs fewer at a
-// time.
+// Any more calls of one client wait here instead of at the server, which runs fewer at a time.
 constexpr size_t kMaxConnections = 16;
 
-/** Connects to whoever answers at the path, and tells whose socket it is. */
+/** Connects to the server at the path; also returns which socket that is. */
 base::unique_fd connectTo(const std::string& path, FileIdentity* identity) {
     sockaddr_un address;
     if (socketAddress(path, &address) != OK) return {};
@@ -33,7 +32,7 @@ base::unique_fd connectTo(const std::string& path, FileIdentity* identity) {
         const int failed = TEMP_FAILURE_RETRY(
                 connect(connection.get(), reinterpret_cast<sockaddr*>(&address), sizeof(address)));
         const int error = errno;
-        // Whatever came of it, a socket that was replaced meanwhile is not the one that is meant.
+        // If the socket was replaced meanwhile, the result is about the wrong one.
         FileIdentity after;
         if (FileIdentity::of(path, &after) != OK || !(after == *identity)) continue;
         if (failed != 0) {
@@ -83,7 +82,7 @@ status_t Session::acquire(int* connection) {
         lock.lock();
         mConnecting = false;
         mChanged.notify_all();
-        // Another incarnation has the name now, so this one can no longer be reached anew.
+        // Another incarnation has the name now, so no new connection can reach this one.
         mMayGrow = mMayGrow && added.ok() && identity == mIdentity;
         if (!mMayGrow) continue;
         *connection = added.get();

@@ -16,8 +16,8 @@
 namespace android::hardware::host {
 
 /**
- * A client's connections to one server incarnation: the process, and the registration, that stood
- * behind the name when the session was opened. It never changes over to another.
+ * A client's connections to one server incarnation: the process and the registration that had the
+ * name when the session was opened. A session never changes to another one.
  */
 class Session {
   public:
@@ -25,18 +25,22 @@ class Session {
     static std::unique_ptr<Session> open(const std::string& path);
 
     /**
-     * A connection for one call; waits for one when there can be no more. Else the status with
-     * which the session ended.
+     * A connection for one call; waits for a free one when there can be no more. After the session
+     * has ended, the status with which it ended.
      */
     status_t acquire(int* connection);
     void release(int connection);
-    /** In place of release(): the server has too many clients and has taken no call from it. */
+    /**
+     * Instead of release(), when the server had too many clients and has taken no call from the
+     * connection.
+     */
     void drop(int connection);
 
     /**
-     * No more calls, for ever and for all the threads.
+     * Ends the session: no thread can make a call any more.
      *
-     * @param status DEAD_OBJECT when the server is gone, WOULD_BLOCK when it never let this in.
+     * @param status DEAD_OBJECT when the server is gone, WOULD_BLOCK when it never accepted this
+     *     client.
      */
     void end(status_t status);
     /** Whether the server had no room for this client. */

@@ -12,8 +12,8 @@
 namespace android::hardware::host {
 
 /**
- * Which file a path led to at one moment: tells a server's socket from the one of another server
- * that took the name over.
+ * The file to which a path led at one moment. It distinguishes a server's socket from that of
+ * another server that took over the name.
  */
 struct FileIdentity {
     dev_t device = 0;
@@ -21,7 +21,7 @@ struct FileIdentity {
     // A file made later may get the number of one that is gone.
     timespec changed = {};
 
-    /** NAME_NOT_FOUND when there is nothing, else what else stat() says. */
+    /** NAME_NOT_FOUND when there is nothing, otherwise the error of stat(). */
     static status_t of(const std::string& path, FileIdentity* identity);
 
     bool operator==(const FileIdentity& other) const {
@@ -32,8 +32,8 @@ struct FileIdentity {
 
 /**
  * The socket of an instance, below socketFolder():
- * "vendor.korvan.bex.wifi@1.0::IWifiService~default". Whatever in the instance's name is neither a
- * letter, a digit, '.', '_' nor '-' stands as % and two hexadecimal digits.
+ * "vendor.korvan.bex.wifi@1.0::IWifiService~default". Every character of the instance's name that
+ * is not a letter, a digit, '.', '_' or '-' is written as % and two hexadecimal digits.
  */
 std::string socketPath(const std::string& descriptor, const std::string& instance);
 

@@ -18,7 +18,7 @@ constexpr size_t kTransactionBufferSize = 1024 * 1024 - 2 * 4096;
 class Reservation {
   public:
     Reservation() = default;
-    /** Takes `size` bytes; afterwards false when there are not so many left. */
+    /** Takes `size` bytes. The object is false when fewer were left. */
     explicit Reservation(size_t size);
     Reservation(Reservation&& other) noexcept
           : mSize(std::exchange(other.mSize, 0)), mTaken(std::exchange(other.mTaken, false)) {}

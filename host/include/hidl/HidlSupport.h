@@ -31,9 +31,9 @@ struct hidl_death_recipient : public virtual RefBase {
 };
 
 /**
- * Text as HIDL carries it: 16 bytes in memory and on the wire, always NUL-terminated, its size
- * counted (so that NULs may stand inside). Owns its bytes unless it borrows them with
- * setToExternal(); what is received in a call is borrowed from the call's buffer.
+ * Text as HIDL carries it: 16 bytes in memory and on the wire, always NUL-terminated, with a size
+ * (so that it may contain NULs). Owns its bytes unless it borrows them with setToExternal(); what
+ * is received in a call is borrowed from the call's buffer.
  *
  *     hidl_string channel = "36";
  *     std::string copy = channel;
@@ -77,7 +77,7 @@ class hidl_string {
     alignas(8) const char* mBuffer;
     uint32_t mSize;
     bool mOwnsBuffer;
-    // Named, so that a call never carries three undefined bytes to another process.
+    // Explicit padding, so that a call never carries three undefined bytes to another process.
     uint8_t mPad[3] = {};
 };
 static_assert(sizeof(hidl_string) == 16, "the wire carries 16 bytes");

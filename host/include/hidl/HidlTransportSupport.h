@@ -20,7 +20,8 @@ namespace android::hardware {
  * Sets how many calls this process serves at a time. Comes before any registration.
  *
  * @param maxThreads The number of threads, at least 1.
- * @param callerWillJoin true when one of them is the caller's, which joinRpcThreadpool() brings in.
+ * @param callerWillJoin true when one of them is the caller's, which then calls
+ *     joinRpcThreadpool().
  */
 void configureRpcThreadpool(size_t maxThreads, bool callerWillJoin);
 
@@ -38,7 +39,7 @@ inline bool debuggable() {
     return false;
 }
 
-/** The checked cast behind the generated castFrom(): null when the object is something else. */
+/** The checked cast for the generated castFrom(): null when the object is something else. */
 template <typename IChild, typename IParent, typename BpChild>
 Return<sp<IChild>> castInterface(const sp<IParent>& parent, const char* name, bool emitError) {
     if (parent == nullptr) return sp<IChild>(nullptr);

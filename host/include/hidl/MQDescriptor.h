@@ -9,7 +9,7 @@
 
 namespace android::hardware {
 
-/** Who may write while others read, of a fast message queue. */
+/** The modes of a fast message queue: who may write while others read. */
 enum MQFlavor : uint32_t { kSynchronizedReadWrite = 0x01, kUnsynchronizedWrite = 0x02 };
 
 /** A fast message queue in an argument list. Only its layout is known here: no method uses one. */

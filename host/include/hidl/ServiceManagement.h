@@ -17,7 +17,7 @@ namespace android::hardware {
 
 /**
  * Answers from the VINTF manifest's files. There is no service manager on a host: the file system
- * takes its place, and lookups do not come by here.
+ * takes its place, and lookups do not use this class.
  */
 sp<hidl::manager::V1_0::IServiceManager> defaultServiceManager();
 

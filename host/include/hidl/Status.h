@@ -60,8 +60,9 @@ std::ostream& operator<<(std::ostream& out, const Status& status);
 namespace details {
 
 /**
- * The Status half of a Return. Whoever drops a failed one without having looked at it, or takes the
- * value of a failed one, aborts: isOk(), isDeadObject() and withDefault() count as having looked.
+ * The Status half of a Return. The process aborts when a failed one is destroyed before anybody has
+ * looked at it, or when its value is taken: isOk(), isDeadObject() and withDefault() count as
+ * having looked.
  */
 class return_status {
   public:

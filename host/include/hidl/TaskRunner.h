@@ -9,8 +9,8 @@
 namespace android::hardware::details {
 
 /**
- * Runs the one-way calls of a passthrough service. No process here has one, so the generated code
- * only needs it to be there: a task runs at once.
+ * Runs the one-way calls of a passthrough service. No process here has such a service; the
+ * generated code only needs the class to exist. A task runs at once.
  */
 class TaskRunner {
   public:

@@ -40,8 +40,8 @@ class IBinder : public virtual RefBase {
                               TransactCallback callback = nullptr) = 0;
 
     /**
-     * Linked twice is notified twice, and linked after the death at once. DEAD_OBJECT when notices
-     * have gone out already, INVALID_OPERATION locally.
+     * A recipient that is linked twice is notified twice; one that is linked after the death, at
+     * once. DEAD_OBJECT when notices have gone out already, INVALID_OPERATION locally.
      */
     virtual status_t linkToDeath(const sp<DeathRecipient>& recipient, void* cookie = nullptr,
                                  uint32_t flags = 0) = 0;

@@ -22,8 +22,8 @@ struct ReceivedBuffer;
 /**
  * The arguments or results of one call: flat data in units of 4 bytes, and buffers. A buffer is an
  * object in the data that refers to memory of the writer, copied when the call is carried; one with
- * a parent also says where in the parent's memory the pointer to it stands, so that the receiver
- * finds the same structure. Reading follows the order of writing.
+ * a parent also says where in the parent's memory the pointer to it is, so that the receiver gets
+ * the same structure. Reading follows the order of writing.
  *
  *     parcel.writeInterfaceToken(IWifiService::descriptor);
  *     parcel.writeBuffer(&text, sizeof(text), &handle);
@@ -98,7 +98,7 @@ class Parcel {
                         size_t parentOffset, const void** buffer) const;
 
     std::vector<uint8_t> mData;
-    // Where in the data the buffer objects stand, ascending. A handle is an index into it.
+    // The places of the buffer objects in the data, ascending. A handle is an index into it.
     std::vector<uint32_t> mObjects;
     mutable size_t mPosition = 0;
     mutable size_t mNextObject = 0;

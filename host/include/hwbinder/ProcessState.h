@@ -9,8 +9,8 @@
 namespace android::hardware {
 
 /**
- * What the generated code asks of the process. Its one request, a thread for death notices, is met
- * elsewhere: the watcher starts with the first linkToDeath().
+ * What the generated code asks of the process. Its one request, a thread for death notices, does
+ * nothing here, as the watcher's thread starts with the first linkToDeath().
  */
 class ProcessState : public RefBase {
   public:

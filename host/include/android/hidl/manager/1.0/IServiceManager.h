@@ -25,7 +25,7 @@ struct IServiceManager : public base::V1_0::IBase {
     virtual hardware::Return<Transport> getTransport(const hardware::hidl_string& fqName,
                                                      const hardware::hidl_string& name) = 0;
 
-    /** Nobody is told of anything here: always false. */
+    /** There are no notifications on a host: always false. */
     virtual hardware::Return<bool> registerForNotifications(
             const hardware::hidl_string& fqName, const hardware::hidl_string& name,
             const sp<IServiceNotification>& callback) = 0;

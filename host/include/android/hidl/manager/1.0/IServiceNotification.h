@@ -7,7 +7,7 @@
 
 namespace android::hidl::manager::V1_0 {
 
-/** Would be told of registrations; see IServiceManager. */
+/** Would be notified of registrations; see IServiceManager. */
 struct IServiceNotification : public base::V1_0::IBase {};
 
 } // namespace android::hidl::manager::V1_0
