@@ -2,7 +2,7 @@
 # SPDX-License-Identifier: Apache-2.0
 """One peer, which is an adb server as a rule, and the streams that it opens.
 
-Whatever the peer sends or leaves out concerns its own connection only. On every stream there is one
+What the peer sends or leaves out affects only its own connection. On every stream there is one
 message on its way in each direction, until its OKAY; so the peer decides how fast it is served, and
 what the phone keeps for it is limited.
 """
@@ -43,7 +43,7 @@ class Connection:
             while True:
                 await self._handle(await messages.read(self._reader))
         except (ProtocolError, EOFError, OSError, asyncio.TimeoutError):
-            pass  # nobody is left to be told
+            pass  # nobody is left to notify
         finally:
             self._writer.transport.abort()  # a peer that reads nothing could not be told goodbye
             for stream in list(self._streams.values()):

@@ -3,7 +3,7 @@
 """The process that answers adb for one phone, from `phone up --adb` to `phone down`.
 
 Like a phone's adbd it does not depend on the service: it goes on when the service ends or is started
-again. It has the file DIR/adb locked, which holds the serial number.
+again. It holds a lock on the file DIR/adb, which has the serial number.
 """
 
 import fcntl
@@ -64,7 +64,7 @@ def end(folder):
     process = os.pidfd_open(pid)
     try:
         if _holder(folder) != pid:
-            return False  # it has ended by itself, and the number may be another's
+            return False  # it has ended by itself, and another process may have its number
         signal.pidfd_send_signal(process, signal.SIGTERM)
         if not select.select([process], [], [], DOWN_SECONDS)[0]:
             signal.pidfd_send_signal(process, signal.SIGKILL)

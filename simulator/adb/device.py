@@ -43,7 +43,7 @@ class Device:
             await self._serve_while_on()
             if self._ends:
                 return
-            # Who connects meanwhile waits in the listener's queue, and is served by a phone that is on.
+            # A client that connects meanwhile waits in the listener's queue until the phone is on.
             for switch in (power.down, power.up):
                 await _in_child(switch, self._folder)
 
@@ -106,7 +106,7 @@ def _banner(folder):
 
 
 def _show_log(folder):
-    """Gives the phone's log a name inside, for logcat. Every boot goes on in the same file."""
+    """Gives the phone's log a name inside, for logcat. Every boot appends to the same file."""
     os.close(os.open(f"{folder}/log", os.O_WRONLY | os.O_CREAT | os.O_APPEND, 0o644))
     inside = Folder(folder, "root/phone")
     inside.remove("log")

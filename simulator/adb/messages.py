@@ -8,9 +8,9 @@
 import collections
 import struct
 
-VERSION = 0x01000001  # from this one on nobody looks at the sum
+VERSION = 0x01000001  # from this version on nobody checks the sum
 LONGEST_DATA = 1 << 18
-SHORTEST_LIMIT = 4096  # what every peer takes
+SHORTEST_LIMIT = 4096  # every peer accepts this many
 
 CNXN, OPEN, OKAY, WRTE, CLSE = (int.from_bytes(name, "little")
                                 for name in (b"CNXN", b"OPEN", b"OKAY", b"WRTE", b"CLSE"))

@@ -1,9 +1,9 @@
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
-"""Finds a file of the phone from outside as the phone itself would, whatever links lie on the way.
+"""Finds a file of the phone from outside as the phone itself would, whatever links are on the way.
 
 An absolute link begins at the phone's root, and no ".." leads above it. Every step opens what it
-found by itself, and a link is read from the descriptor: what changes meanwhile leads nowhere else.
+found by itself, and a link is read from the descriptor: so a change meanwhile cannot lead elsewhere.
 """
 
 import errno

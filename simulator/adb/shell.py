@@ -114,7 +114,7 @@ class Process:
                 code = self._process.wait()
                 await stream.write(_packet(EXIT, bytes([code if code >= 0 else 128 - code])))
         finally:
-            # No task may be left that waits for a descriptor whose number another one will have.
+            # No task may go on waiting for this descriptor: another one will get its number.
             for task in tasks:
                 task.cancel()
             await asyncio.gather(*tasks, return_exceptions=True)

@@ -25,7 +25,7 @@ _unfinished = itertools.count()
 
 
 class SyncError(Exception):
-    """A request that nothing can come after."""
+    """A request after which the connection is useless."""
 
 
 async def serve(root, stream):

@@ -2,8 +2,8 @@
 # SPDX-License-Identifier: Apache-2.0
 """Builds a phone's root file system: complete, or not at all.
 
-Links inside the root are relative, so that following one from outside stays inside. Everything of
-the simulation itself is below /phone, which no real phone has.
+Links inside the root are relative, so that following one from outside stays inside. The simulation's
+own files are below /phone, a folder that no real phone has.
 """
 
 import errno

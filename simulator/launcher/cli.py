@@ -30,7 +30,7 @@ CHIP is a name in simulator/phones, or the path (with a slash) of a description 
 
 
 class UsageError(Exception):
-    """Arguments that fit no command."""
+    """Arguments that no command accepts."""
 
 
 def main(arguments):

@@ -1,6 +1,6 @@
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
-"""Reads the description of a phone: one statement a line, words parted by blanks, # comments.
+"""Reads the description of a phone: one statement on each line, blanks between words, # before a comment.
 
     property NAME VALUE            a line of /vendor/build.prop
     driver NAME                    the driver model, a file of simulator/drivers

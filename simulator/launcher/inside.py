@@ -2,9 +2,9 @@
 # SPDX-License-Identifier: Apache-2.0
 """Reaches the files inside a phone from outside.
 
-What runs inside may put a link in the place of any of them, and a link that is followed outside
-leads to the machine's files. So every folder on the way is opened by itself, none through a link,
-and files are named relative to the folder that is open.
+A program inside may replace any of them by a link, and a link that is followed outside leads to the
+machine's files. So each folder on the way is opened separately, never through a link, and files are
+named relative to the open folder.
 """
 
 import os
@@ -50,7 +50,7 @@ class Folder:
             return 0
 
     def open(self, name, flags):
-        """A descriptor. Opening waits for nobody, and creates only what is not there."""
+        """A descriptor. Opening never waits, and creates only a file that is not there."""
         if flags & os.O_CREAT:
             flags |= os.O_EXCL
         return self._do(os.open, name, flags | os.O_NOFOLLOW | os.O_NONBLOCK, 0o644, dir_fd=self.fd)

@@ -11,7 +11,7 @@ CREATE_RULESET_VERSION = 1
 RULE_PATH_BENEATH = 1
 PR_SET_NO_NEW_PRIVS = 38  # from <linux/prctl.h>
 
-# From <linux/landlock.h>, by the version that knows them first.
+# From <linux/landlock.h>, by the first version that has them.
 WRITE_FILE, REFER, TRUNCATE = 1 << 1, 1 << 13, 1 << 14
 REMOVE_AND_MAKE = 0x1FF0
 TCP = 0x3
@@ -30,7 +30,7 @@ def confine(paths):
     """From now on this process changes no file but those in `paths` and below, opens no TCP
     connection, and reaches no process and no abstract socket outside, as far as the kernel can."""
     has = version()
-    if has < 2:  # the first one refuses each move to another folder
+    if has < 2:  # version 1 refuses each move to another folder
         return
     files = WRITE_FILE | REMOVE_AND_MAKE | REFER | (TRUNCATE if has >= 3 else 0)
     limits = struct.pack("QQQ", files, TCP if has >= 4 else 0,

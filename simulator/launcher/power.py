@@ -5,7 +5,7 @@
 A phone that is on is one process of this machine, the keeper: it holds the sandbox in which init
 and the service run, and ends when they do. It keeps the file DIR/pid locked, so a phone is on
 exactly as long as that lock is held, however the keeper ended. A byte in the fifo DIR/stop ends it;
-no process is killed by a number, which may have become another's. Commands that switch a phone wait
+no process is killed by its number, which another process may have by now. Commands that switch a phone wait
 for each other: they lock DIR itself.
 """
 
@@ -84,7 +84,7 @@ def _locks(file):
 
 
 def _until(seconds, condition):
-    """Waits for a condition; whether it came true in that time."""
+    """Waits for a condition; returns whether it became true in that time."""
     deadline = time.monotonic() + seconds
     while not condition():
         if time.monotonic() > deadline:
@@ -167,7 +167,7 @@ def _await_service(folder, sockets, keeper):
 
 
 def _registered(sockets):
-    """The sockets of what is registered. A hidden one is not ready yet."""
+    """The sockets of the registered services. A hidden one is not ready yet."""
     return [name for name in sockets.names()
             if not name.startswith(".") and sockets.kind(name) == stat.S_IFSOCK]
 
@@ -180,7 +180,7 @@ def _remove_borrowed(kind, folder):
 
 
 def _end_keeper(folder, lock):
-    """Locks DIR/pid once the keeper has ended; whether there was one."""
+    """Locks DIR/pid once the keeper has ended; returns whether there was one."""
     asked = False
 
     def ended():
@@ -196,7 +196,7 @@ def _end_keeper(folder, lock):
 
 
 def _make_stop(folder):
-    """A new fifo, open for the keeper: what is written from now on is not lost."""
+    """A new fifo, open for the keeper, so that nothing written from now on is lost."""
     path = f"{folder}/stop"
     if os.path.lexists(path):
         os.remove(path)
@@ -223,7 +223,7 @@ def _keeper_listens(folder):
 
 
 def _ask_to_stop(folder):
-    """Ends the keeper, but does not wait for it; whether there is one."""
+    """Ends the keeper, but does not wait for it; returns whether there is one."""
     stop = _open_stop(folder)
     if stop is None:
         return False

@@ -7,8 +7,8 @@
     sandbox     bwrap or proot, in another session
     inside      under bwrap in one more, under proot in the sandbox's
 
-So no process group reaches from inside out, and what runs inside has no controlling terminal that
-it could type into. The holder ends every child that it has; those that the launcher's caller may
+So no process group has members both inside and outside, and what runs inside has no controlling
+terminal that it could type into. The holder ends every child that it has; those that the launcher's caller may
 have left to the launcher are not among them. The keeper of a phone that is on is a holder, too.
 """
 
@@ -47,7 +47,7 @@ def run(kind, folder, command, streams=()):
             signal.signal(number, lambda number, _frame: _pass_on(holder, number))
     unblock_signals()
     os.waitid(os.P_PID, holder, os.WEXITED | os.WNOWAIT)
-    block_signals()  # nothing is passed on once the next line has freed the holder's number
+    block_signals()  # pass on no signal once the next line has freed the holder's number
     status = os.waitpid(holder, 0)[1]
     terminal.restore()
     return _code(status)
@@ -96,7 +96,7 @@ class _Terminal:
         self.modes = None if self.stream is None else termios.tcgetattr(self.stream)
 
     def restore(self):
-        """Unless the terminal has gone, or is another job's by now."""
+        """Does nothing if the terminal has gone, or belongs to another job by now."""
         try:
             if self.modes and os.tcgetpgrp(self.stream) == os.getpgrp():
                 termios.tcsetattr(self.stream, termios.TCSANOW, self.modes)
@@ -134,13 +134,13 @@ class Sandbox:
         status = os.waitpid(self.pid, 0)[1]
         _end_orphans()
         if os.WIFSIGNALED(status) and self.kind == "proot":
-            for name in os.listdir("/tmp"):  # what a killed proot leaves there
+            for name in os.listdir("/tmp"):  # processes that a killed proot has left
                 if name.startswith(f"prooted-{self.pid}-"):
                     os.remove(f"/tmp/{name}")
         return 128 + self.ended_by if self.ended_by else _code(status)
 
     def _become(self):
-        """In the forked child: turns into the sandbox. Nothing of the caller is inherited but the
+        """In the forked child: turns into the sandbox. Nothing of the caller is inherited except the
         three standard streams."""
         try:
             os.setsid()
@@ -159,7 +159,7 @@ class Sandbox:
             os._exit(125)
 
     def _wait(self, stop):
-        """Returns when the sandbox has ended, which is left to be reaped."""
+        """Returns when the sandbox has ended; does not reap it."""
         ended = os.pidfd_open(self.pid)
         waiting = select.poll()
         waiting.register(ended, select.POLLIN)

@@ -1,13 +1,13 @@
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
-"""Entering a phone: its root becomes /, and nothing inside can reach the machine around it.
+"""Enters a phone: its root becomes /, and nothing inside can reach the machine around it.
 
 Two ways in, tried in this order when the phone is created and remembered in its folder:
 
 bwrap  Namespaces of its own for users, processes, network, IPC, host name and cgroup; no capability
        left; /proc mounted afresh and read-only. Inside, the phone's owner is user 0.
 proot  Paths are translated with ptrace. Shares the machine's network and process numbers, so every
-       capability is dropped, for good, before anything runs; as root that is a condition.
+       capability is dropped, for good, before anything runs; root cannot use proot otherwise.
 
 Both die with the process that started them; process.py does the rest.
 """
@@ -92,7 +92,7 @@ def _program(name):
 
 
 def _borrowed_devices(root):
-    """The devices that the phone has no node of its own for: the machine's own are bound."""
+    """The devices for which the phone has no node of its own: it gets the machine's."""
     folder = Folder(root, "dev")
     return [f"/dev/{name}" for name in DEVICES if folder.kind(name) == stat.S_IFREG]
 

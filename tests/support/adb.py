@@ -2,8 +2,8 @@
 # SPDX-License-Identifier: Apache-2.0
 """Debian's adb with a server of its own, and phones that answer it.
 
-The server has a socket in a temporary folder in place of a port, its keys lie there too, and it looks
-for no emulators: the user's server and phones are left alone.
+The server has a socket in a temporary folder in place of a port, its keys are there too, and it does not
+look for emulators: it does not touch the user's server and phones.
 """
 
 import contextlib
@@ -73,7 +73,7 @@ class AdbPhone(Phone):
         return self.adb("connect", self.serial).stdout == f"connected to {self.serial}\n".encode()
 
     def forget(self):
-        """Keeps the server from trying a phone that has gone."""
+        """Makes the server give up a phone that has gone."""
         if self.serial:
             self.adb("disconnect", self.serial)
 
@@ -103,7 +103,7 @@ def adb_fixture():
 
 @contextlib.contextmanager
 def made_phone(adb, chip):
-    """A phone that is off, and will be."""
+    """A phone that is not up yet, and is switched off at the end."""
     with tempfile.TemporaryDirectory(prefix="bex-") as folder:
         phone = AdbPhone(adb, chip, pathlib.Path(folder, "0"))
         try:

@@ -1,6 +1,6 @@
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
-"""Speaks adb's protocol to a phone without adb, so as to send what adb never would."""
+"""Speaks adb's protocol to a phone without adb, to send messages that adb never would."""
 
 import contextlib
 import socket

@@ -1,6 +1,6 @@
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
-"""What a client gets on the phones of each chip family, where the families differ."""
+"""The answers that a client gets on the phones of each chip family, where the families differ."""
 
 import dataclasses
 

@@ -39,7 +39,7 @@ class Phone:
         self.folder = folder
         self.root = folder / "root"
         self.log = folder / "log"
-        # The reports of which a test knows that they come: a pattern.
+        # A pattern for the reports that a test expects.
         self.expected_report = None
         self.phone("create", chip, folder,
                    "--install", f"{service or os.environ['BEX_SERVICE']}=/vendor/bin/hw/{SERVICE}",
@@ -87,7 +87,7 @@ class Phone:
                 if not (self.expected_report and re.search(self.expected_report, report))]
 
     def look_for_leaks(self):
-        """Has the service do so, unless it has ended."""
+        """Makes the service look for leaks, unless it has ended."""
         def looks():
             return self.log.read_bytes().count(b"looked for leaks\n")
 
@@ -156,10 +156,10 @@ class Phone:
 
 @pytest.fixture(name="make_phone")
 def make_phone_fixture():
-    """Makes a phone that is not up yet, with options of `phone create` at will; it is switched off
+    """Makes a phone that is not up yet, with any options of `phone create`; it is switched off
     when the test ends."""
     made = []
-    # A short path: in a deep folder the phone would borrow another place for its sockets.
+    # A short path: in a deep folder the phone would use another place for its sockets.
     with tempfile.TemporaryDirectory(prefix="bex-") as folder, contextlib.ExitStack() as ends:
 
         def make(chip, *installs, **programs):

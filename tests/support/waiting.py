@@ -6,7 +6,7 @@ import time
 
 
 def wait_for(condition):
-    """Waits until the condition holds; a minute means that it never will."""
+    """Waits until the condition is true; fails after a minute."""
     deadline = time.monotonic() + 60
     while not condition():
         assert time.monotonic() < deadline, "the condition never came true"
