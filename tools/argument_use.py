@@ -1,6 +1,6 @@
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
-"""What a chip family does with each argument of a method, found out by varying one after another.
+"""What a chip family does with each argument of a method, found out by varying them one by one.
 
     use = MethodUse(phone, method)
     use.ignored()    # ("power",)
@@ -12,14 +12,14 @@ import dataclasses
 import itertools
 import re
 
-# What no chip knows: the answer to any other text.
+# A value that no chip knows: it shows what any other text leads to.
 OTHER = "x"
 
 CHANNELS = [str(channel) for channel in
             (*range(1, 15), *range(36, 65, 4), *range(100, 145, 4), *range(149, 178, 4))]
 
 # All values that may make a difference, and the few that show whether an argument is used at all.
-# Rates depend on the method, and so stand below.
+# Rates depend on the method, so they are further below.
 VALUES = {
     "channel": [*CHANNELS, OTHER],
     "bandwidth": ["20", "40", "80", "160", OTHER],
@@ -31,13 +31,13 @@ VALUES = {
     "address": ["192.168.1.7", OTHER],
 }
 SAMPLES = {"channel": ["6", "1", "14", "36", "149", OTHER]}
-# Where the others are varied from: what one does may depend on these.
+# The starting values of all arguments: the effect of one may depend on the others.
 BASES = {"channel": ["6", "36"], "vht": ["false", "true"], "bandwidth": ["20", "80"]}
 # The arguments of which every combination is tried.
 CHOICES = ("bandwidth", "vht")
 MCS_INDICES = [str(index) for index in range(14)]
 
-# The lines that put something on the air or count what is there.
+# The lines that transmit, or count what is received.
 TEST_COMMANDS = [
     ("transmission", r"myftm .*-t 3 |wl pkteng_start \S+ tx |iwpriv wlan0 tx 1 "),
     ("tone", r"myftm .*-t 1 |wl fqacurcy [^0]|iwpriv wlan0 tx_cw_rf_gen 1 "),
@@ -133,7 +133,7 @@ class MethodUse:
                 for lines in self.answers.values() for line in lines if re.search(pattern, line))
 
     def remarks(self):
-        """What surprises beyond the ignored arguments, a sentence each."""
+        """What else a caller would not expect, besides ignored arguments, one sentence each."""
         return [*self._start_remarks(), *self._same_lines()]
 
     def codes(self, slot):
@@ -223,7 +223,7 @@ class MethodUse:
             for column in columns])
 
     def _joined(self, parts):
-        """Options of which the first is missing at times are one slot, if one choice sets both."""
+        """Options are one slot if one choice sets them all, even if the first is sometimes missing."""
         for i, (first, word, last) in enumerate(zip(parts, parts[1:], parts[2:])):
             if not (isinstance(first, Slot) and isinstance(last, Slot)):
                 continue

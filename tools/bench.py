@@ -85,7 +85,7 @@ def counts(build):
 
 
 class Table:
-    """The figures, and whether all are reached."""
+    """The figures, and whether all limits are kept."""
 
     def __init__(self):
         self.rows = []
@@ -166,7 +166,7 @@ def texts(table, build, repetitions, min_time):
 
 def calls(table, build, repetitions, min_time):
     program = build / "benchmarks/call-bench"
-    # On one processor: where the scheduler puts the two processes would decide otherwise.
+    # On one processor: otherwise the result would depend on where the scheduler puts the two processes.
     one = str(min(os.sched_getaffinity(0)))
     value = medians(program, repetitions, min_time, "latency", ("taskset", "-c", one))
     for key, limit in (("p50", 1.4), ("p99", 2)):

@@ -4,8 +4,8 @@
 """Writes down what the running code does with each call: catalogue.py [--check] EXPLAIN.
 
 EXPLAIN is the built explain program. For every simulated phone there is a page in docs/commands/
-with the command lines of typical calls and what becomes of each argument; what surprises there also
-goes into the table of the client's help. With --check nothing is written, and the exit code tells
+with the command lines of typical calls and the use of each argument; what a caller would not expect
+also goes into the table of the client's help. With --check nothing is written, and the exit code tells
 whether all of that is up to date.
 """
 
@@ -98,7 +98,7 @@ differ in one argument, runs none, and compares. A test fails when a page and th
 
 
 def argument_rows(use):
-    """For each argument where it gets to."""
+    """For each argument the places where it appears."""
     found = []
     for argument in use.method.arguments:
         places = []
@@ -144,7 +144,7 @@ def page(chip, phone, uses):
 
 
 def families(phones):
-    """Which family each of some names belongs to, the letters' case being turned round in some."""
+    """The family of each of some names, also with upper and lower case exchanged."""
     rows = []
     for name, phone in phones.items():
         own = phone.value("ro.hardware.wlan.chip")

@@ -1,6 +1,6 @@
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
-"""Tables of codes in Markdown: what stands in a command line for which value of an argument."""
+"""Tables of codes in Markdown: which code a command line has for each value of an argument."""
 
 import itertools
 
@@ -8,7 +8,7 @@ import argument_use
 
 # The arguments whose values are numbers in a row.
 NUMBERED = ("channel", "MCS index")
-# The arguments of which the service knows some values, and takes all others alike.
+# The arguments of which the service knows some values, and treats all others alike.
 LISTED = ("rate (Mbit/s)", "bandwidth (MHz)")
 
 
@@ -32,7 +32,7 @@ def slope(first, second, texts):
 
 
 def straight(name, values, texts):
-    """The formula behind the codes of the values; None where they lie on no straight line."""
+    """The formula that gives the codes of the values; None where they lie on no straight line."""
     slopes = {slope(a, b, texts) for a, b in itertools.pairwise(values)}
     if len(values) < 4 or len(slopes) != 1:
         return None
@@ -110,7 +110,7 @@ def by_choice(codes, place):
 
 
 def context(line, place):
-    """The words in front of a place in a line, short: "myftm … -f"."""
+    """The words before a place in a line, shortened: "myftm … -f"."""
     words = [str(part) for part in line[:place]]
     option = any(text.startswith("-") for text in line[place].texts.values())
     if option and not words[-1].startswith("-"):

@@ -32,8 +32,8 @@ SESSION = [
 ]
 
 
-# A driver is all module files of a folder. Where an image is for several chips, the ones that do not
-# fit are refused, and the one that fits is enough.
+# The driver is all module files of a folder. When an image is for several chips, insmod refuses the
+# files for the others, and the one that fits is enough.
 REFUSED = "FAILED, as it should: the module does not fit this phone"
 
 
@@ -63,7 +63,7 @@ def main():
     chip, phone = sys.argv[1], sys.argv[2]
     log = pathlib.Path(phone) / "log"
     refused = 0
-    # One who watches through a pipe sees each call when it is made.
+    # So that each call shows at once also through a pipe.
     sys.stdout.reconfigure(line_buffering=True)
     print(f"The simulated {chip} phone is up; its service answers a client in another process.")
     for purpose, call in SESSION:

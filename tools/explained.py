@@ -1,6 +1,6 @@
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
-"""What the running code makes of calls, told by the explain program; nothing is run.
+"""The command lines of calls, as the explain program prints them; it runs none of them.
 
     for phone in phones(explain, folder):
         phone.lines([("RunTxStop", "6")])    # [["myftm -t 0 ", ...]]
@@ -24,7 +24,7 @@ def run(*command, root=None, asked=""):
 
 @dataclasses.dataclass(frozen=True)
 class Argument:
-    """An argument of a method, as the client's table has it."""
+    """An argument of a method, from the client's table."""
     name: str
     # "string" or "bool".
     type: str
@@ -64,7 +64,7 @@ def read_methods(listed):
 
 @dataclasses.dataclass(frozen=True)
 class Phone:
-    """A simulated phone that is not up."""
+    """A simulated phone that is switched off."""
     explain: pathlib.Path
     root: pathlib.Path
 

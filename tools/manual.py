@@ -1,7 +1,7 @@
 #!/usr/bin/python3 -B
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
-"""Makes of the client's own help what is installed beside it: manual.py CLIENT page|completion.
+"""Makes the files installed beside the client from its own help: manual.py CLIENT page|completion.
 
 Prints the manual page (section 1) or the completion for bash. CLIENT is the built client; it is
 asked for its help and its list of methods, and calls nothing.
@@ -20,7 +20,7 @@ NAME = "bex-wifi-client"
 
 
 def ask(client, *arguments):
-    """What the client prints. Outside of a phone it knows no chip family to tell of."""
+    """What the client prints. Outside of a phone its help names no chip family."""
     environment = {name: value for name, value in os.environ.items() if name != "HIDL_HOST_ROOT"}
     return subprocess.run([client, *arguments], env=environment, check=True, text=True,
                           stdout=subprocess.PIPE).stdout
@@ -90,7 +90,7 @@ _bex_wifi_client() {{
         esac
     done
     COMPREPLY=()
-    # The number of seconds is anybody's choice.
+    # Any number of seconds is possible: there is nothing to complete.
     [ "${{COMP_WORDS[COMP_CWORD - 1]}}" != --timeout ] || return 0
     case $command:$place in
         :0) candidates="{commands}" ;;

@@ -1,6 +1,6 @@
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
-"""What chips/MethodUseTable.cpp holds: the ignored arguments and the remarks of each method."""
+"""The content of chips/MethodUseTable.cpp: the ignored arguments and the remarks of each method."""
 
 HEAD = """\
 // Copyright 2026 The BEX Wi-Fi Authors

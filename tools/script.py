@@ -6,7 +6,7 @@ import sys
 
 
 def run(main, *arguments):
-    """Ends the program with what `main` returns; Ctrl-C ends it with 130 and without a word."""
+    """Ends the program with what `main` returns; Ctrl-C ends it with 130 and no message."""
     try:
         sys.exit(main(*arguments))
     except KeyboardInterrupt:

@@ -19,13 +19,13 @@ class Command:
     """A command line that ran."""
     line: str
     succeeded: bool
-    # What came of it in the log before its outcome: what its tools printed, on stderr too.
+    # The lines between it and its outcome in the log: what its tools printed, also on stderr.
     printed: str
 
 
 def messages(log):
     """The (tag, text) pairs of a piece of log."""
-    # What splits are the heads' tags, each ahead of its text.
+    # The split gives each head's tag before its text.
     parts = HEAD.split(log)[1:]
     return list(zip(parts[::2], parts[1::2]))
 

@@ -4,7 +4,7 @@
 #
 # How ./dev speaks, ends, waits its turn and shows that something goes on.
 
-# What the tools say about a person's mistake stands on one line.
+# A mistake of the user gets one line.
 die() {
     echo "dev: $1" >&2
     exit "${2:-1}"

@@ -1,13 +1,13 @@
 #!/usr/bin/python3 -B
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
-"""Runs a command, and ends with it everything that it has started.
+"""Runs a command, and when it ends, ends everything that it has started.
 
 usage: tools/dev/supervise.py COMMAND [ARGUMENT]...
 
 Ctrl-C and the other signals that end a program reach the command's process group as one SIGINT, and
-the group may clean up for a while. What is there after that, in whatever session or group, is killed;
-with a second Ctrl-C at once. The exit code is the command's own, or 130 after a signal.
+the group may clean up for a while. What still runs after that, in any session or group, is killed;
+after a second Ctrl-C at once. The exit code is the command's own, or 130 after a signal.
 """
 
 import contextlib

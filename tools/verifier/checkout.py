@@ -1,6 +1,6 @@
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
-"""The files that are held against each other, and the problems found."""
+"""The files that are compared, and the problems found."""
 
 import re
 
@@ -46,7 +46,7 @@ class Checkout:
         return match, text.count("\n", 0, match.start()) + 1
 
     def paths(self, folder, pattern):
-        """The files of a folder, not of those below it, that fit a pattern."""
+        """The files of a folder, not of those below it, that match a pattern."""
         found = sorted((self.root / folder).glob(pattern))
         return [str(path.relative_to(self.root)) for path in found if path.is_file()]
 

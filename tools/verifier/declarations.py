@@ -1,9 +1,9 @@
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
-"""The service goes by the same names wherever the platform is told of it.
+"""The service has the same names in every file that declares it to the platform.
 
 The names come from the interface's definition, from main() (the instance) and from Soong (the
-binary); everything else is held against these.
+binary); everything else is compared with these.
 """
 
 import os
@@ -68,7 +68,7 @@ def in_its_place(checkout, names):
 
 def frozen_hash(checkout, names):
     with tempfile.TemporaryDirectory() as unfrozen:
-        # Without the current.txt beside it, or a changed definition would print no hash at all.
+        # Without the current.txt beside it: with it, a changed definition would print no hash at all.
         os.symlink((checkout.root / "interface" / names.version).resolve(),
                    os.path.join(unfrozen, names.version))
         printed = subprocess.run(
@@ -195,7 +195,7 @@ def contexts(checkout, name):
 
 
 def hwservice_context(checkout, names):
-    """Without the version: the policy is the same for all."""
+    """Without the version: the policy is the same for all versions."""
     path = f"{POLICY}/hwservice_contexts"
     entries = list(contexts(checkout, "hwservice_contexts"))
     name = f"{names.package}::{names.interface}"
@@ -222,7 +222,7 @@ def file_context(checkout, names):
 
 
 def makefiles(checkout, names):
-    """What the device's makefiles take in exists, as modules and files."""
+    """The modules and files that the device's makefiles name exist."""
     known = {module.name for path in checkout.blueprints()
              for module in blueprint.read(checkout, path)}
     packages = [(number, word) for number, line in checkout.lines(PRODUCT)
@@ -243,7 +243,7 @@ def makefiles(checkout, names):
 
 
 def board_files(checkout, variant="userdebug"):
-    """What the device gets by including the file, on the way to another makefile."""
+    """What the device gets when another makefile includes the file."""
     board_config = f"""
 BOARD_SEPOLICY_DIRS =
 include {BOARD}

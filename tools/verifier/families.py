@@ -1,6 +1,6 @@
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
-"""Each chip family is wherever docs/adding-a-chip.md wants a row of it.
+"""Each chip family has every row that docs/adding-a-chip.md asks for.
 
 The families are those of chips/ChipFamily.cpp; the suites are the files of suites/.
 """

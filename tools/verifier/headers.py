@@ -1,6 +1,6 @@
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
-"""No header of host/include brings more than the platform's header of the same name.
+"""No header of host/include gives more than the platform's header of the same name.
 
 What compiles on a host only because a header is generous does not compile on a phone.
 """
@@ -27,7 +27,7 @@ PLATFORM = {
     "hidl/HidlSupport.h":
         "algorithm array iterator map sstream tuple type_traits vector cutils/native_handle.h "
         "hidl/HidlInternal.h hidl/Status.h utils/Errors.h utils/RefBase.h utils/StrongPointer.h",
-    # The generated proxies have a mutex, and nothing else than this header could bring it.
+    # The generated proxies have a mutex, and only this header could declare it.
     "hidl/HidlTransportSupport.h":
         "android/hidl/base/1.0/IBase.h hidl/HidlBinderSupport.h hidl/HidlPassthroughSupport.h "
         "hidl/HidlSupport.h hidl/HidlTransportUtils.h hidl/ServiceManagement.h mutex",
@@ -56,7 +56,7 @@ PLATFORM = {
         "hidl/HidlSupport.h hidl/MQDescriptor.h hidl/Status.h utils/NativeHandle.h utils/misc.h",
     "utils/RefBase.h": "atomic functional type_traits utils/StrongPointer.h",
 }
-# Whichever C++ header a source has, it has these as well.
+# A source that includes any C++ header has these as well.
 ALWAYS = {"cstddef", "cstdint", "string", "type_traits", "utility"}
 
 # Named there, and nowhere defined: who needs one whole includes its own header.
@@ -86,7 +86,7 @@ def verify(checkout):
 
 
 def everything(name):
-    """What the platform's header brings, by way of others too."""
+    """What the platform's header gives, also through headers that it includes."""
     found, waiting = set(ALWAYS), [name]
     while waiting:
         for included in PLATFORM.get(waiting.pop(), "").split():

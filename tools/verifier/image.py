@@ -1,6 +1,6 @@
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
-"""What Android 11's vendor image asks of modules, labels and paths, and no compiler here sees."""
+"""What Android 11's vendor image requires of modules, labels and paths. No compiler here checks that."""
 
 import pathlib
 import re
@@ -38,7 +38,7 @@ def verify(checkout):
 
 
 def vendor_libraries(checkout):
-    """Soong gives a vendor module only what has a variant for vendors."""
+    """Soong links a vendor module only with modules that have a variant for vendors."""
     modules = [module for path in checkout.blueprints()
                for module in blueprint.read(checkout, path)]
     own = {module.name for module in modules}
@@ -51,7 +51,7 @@ def vendor_libraries(checkout):
 
 
 def labelled_tools(checkout):
-    """The policy executes what has the platform's label for tools, or the one for the tools here."""
+    """The policy lets the service execute files with the platform's label for tools, or with its own."""
     path = f"{POLICY}/file_contexts"
     patterns = [pattern for _, pattern, label in contexts(checkout, "file_contexts")
                 if label == "bex_wifi_tool_exec"]
