@@ -5,7 +5,7 @@ find_path(ANDROID_INCLUDE_DIR utils/RefBase.h PATHS /usr/include/android NO_DEFA
 find_program(HIDL_GEN hidl-gen REQUIRED)
 
 foreach(library base cutils log utils)
-    # They lie in a folder of their own, which the linker and the loader do not search by themselves.
+    # They are in a folder of their own, which the linker and the loader do not search by default.
     find_library(ANDROID_LIB_${library} ${library} PATH_SUFFIXES android REQUIRED)
     add_library(android::${library} UNKNOWN IMPORTED)
     set_target_properties(

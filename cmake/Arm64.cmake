@@ -14,7 +14,7 @@ set(CMAKE_FIND_ROOT_PATH_MODE_LIBRARY ONLY)
 set(CMAKE_FIND_ROOT_PATH_MODE_INCLUDE ONLY)
 set(CMAKE_FIND_ROOT_PATH_MODE_PACKAGE ONLY)
 
-# What the libraries themselves need: the linker looks there, and no program names it.
+# The linker looks here for the libraries that the libraries themselves need.
 foreach(folder aarch64-linux-gnu aarch64-linux-gnu/android p7zip)
     string(APPEND CMAKE_EXE_LINKER_FLAGS_INIT " -Wl,-rpath-link,${sysroot}/usr/lib/${folder}")
 endforeach()

@@ -36,7 +36,7 @@ function(hidl_package target)
     add_custom_target(${target}-generated DEPENDS ${HIDL_GENERATED})
     add_dependencies(generated ${target}-generated)
     add_library(${target} STATIC ${HIDL_GENERATED})
-    # Not ours to mend: warnings in generated code are hidl-gen's.
+    # We cannot fix warnings in generated code: they come from hidl-gen.
     target_compile_options(${target} PRIVATE -w)
     target_include_directories(${target} SYSTEM PUBLIC ${HIDL_OUTPUT})
 endfunction()

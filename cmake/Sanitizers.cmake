@@ -2,7 +2,7 @@
 #   address  AddressSanitizer, LeakSanitizer and UndefinedBehaviorSanitizer
 #   thread   ThreadSanitizer
 #
-# TIMEOUT_FACTOR: how much longer a test may take than without.
+# TIMEOUT_FACTOR: how many times longer a test may take than without a sanitizer.
 
 set(SANITIZE "" CACHE STRING "address or thread")
 set(TIMEOUT_FACTOR 1)

@@ -1,7 +1,7 @@
 # Copyright 2026 The BEX Wi-Fi Authors
 # SPDX-License-Identifier: Apache-2.0
 #
-# For BoardConfig.mk, wherever the checkout lies:
+# For BoardConfig.mk, wherever the checkout is:
 #
 #     include vendor/korvan/bex/wifi/service/board.mk
 #

@@ -6,7 +6,7 @@
 #     $(call inherit-product, vendor/korvan/bex/wifi/service/product.mk)
 #
 # PRODUCT_PACKAGES_DEBUG leaves user builds without the service: whoever may call it may run any
-# command line. A property that keeps it from starting would not do, as init starts a service whose
+# command line. A property that keeps it from starting is not enough, as init starts a service whose
 # interface a client asks for, disabled or not.
 
 PRODUCT_PACKAGES_DEBUG += \

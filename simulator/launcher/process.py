@@ -8,8 +8,9 @@
     inside      under bwrap in one more, under proot in the sandbox's
 
 So no process group has members both inside and outside, and what runs inside has no controlling
-terminal that it could type into. The holder ends every child that it has; those that the launcher's caller may
-have left to the launcher are not among them. The keeper of a phone that is on is a holder, too.
+terminal that it could type into. The holder ends all its children. Children that the launcher's
+caller may have left to the launcher are not among them. The keeper of a phone that is on is also a
+holder.
 """
 
 import ctypes
