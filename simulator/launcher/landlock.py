@@ -27,8 +27,8 @@ def version():
 
 
 def confine(paths):
-    """From now on this process changes no file but those in `paths` and below, opens no TCP
-    connection, and reaches no process and no abstract socket outside, as far as the kernel can."""
+    """From now on this process can change only files in `paths` and below, open no TCP connection,
+    and reach no process and no abstract socket outside, as far as the kernel can prevent it."""
     has = version()
     if has < 2:  # version 1 refuses each move to another folder
         return

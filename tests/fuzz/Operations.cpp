@@ -24,7 +24,7 @@ std::unique_ptr<VendorTestSuit> make() {
     return std::make_unique<Suit>();
 }
 
-/** The module file belongs to the process: looked for anew, so that no input has another's. */
+/** The process keeps the module file, so look for it again: no input may see another one's. */
 template <typename Suit>
 std::unique_ptr<VendorTestSuit> makeAndLookAgain() {
     auto suite = std::make_unique<Suit>();

@@ -11,7 +11,7 @@
 namespace android::hardware {
 
 /**
- * Names a test that is run for each instance of an interface. GoogleTest wants such names unique
+ * Names a test that is run for each instance of an interface. GoogleTest needs such names unique
  * and of letters, digits and underscores: "0_default" for the first instance, "default".
  *
  *     INSTANTIATE_TEST_SUITE_P(PerInstance, WifiTest,
