@@ -40,8 +40,8 @@ def port_of(serial):
 
 def listeners(port):
     """The addresses at which something of this machine listens on the port, as the kernel has them."""
-    rows = [line.split() for name in ("tcp", "tcp6")
-            for line in pathlib.Path("/proc/net", name).read_text().splitlines()[1:]]
+    rows = [line.split() for table in pathlib.Path("/proc/net").glob("tcp*")  # no tcp6 without IPv6
+            for line in table.read_text().splitlines()[1:]]
     return [row[1] for row in rows if row[1].endswith(f":{port:04X}") and row[3] == "0A"]
 
 

@@ -58,7 +58,7 @@ def service(phone):
 
 
 def run(*arguments, **options):
-    options = {"stdout": subprocess.PIPE, "stderr": subprocess.PIPE, "timeout": 30, **options}
+    options = {"stdout": subprocess.PIPE, "stderr": subprocess.PIPE, "timeout": 60, **options}
     done = subprocess.run([CLIENT, *arguments], stdin=subprocess.DEVNULL, check=False, **options)
     output.validate(arguments, done.stdout)
     return done

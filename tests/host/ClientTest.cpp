@@ -203,7 +203,7 @@ TEST_F(ClientTest, RecipientMayDropTheProxy) {
     EXPECT_TRUE(service->linkToDeath(dropper, 0).withDefault(false));
     service.clear();
     killServer();
-    EXPECT_EQ(dropper->dropped.get_future().wait_for(std::chrono::seconds(20)),
+    EXPECT_EQ(dropper->dropped.get_future().wait_for(std::chrono::seconds(60)),
               std::future_status::ready);
 }
 

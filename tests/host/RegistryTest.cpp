@@ -190,12 +190,12 @@ TEST_F(RegistryTest, AWatchKnowsNothingOfAnEarlierOnesNews) {
     {
         ::android::hardware::host::RegistrationWatch watch;
         write("dev/socket/news", "");
-        EXPECT_TRUE(watch.wait(milliseconds(20'000)));
+        EXPECT_TRUE(watch.wait(milliseconds(60'000)));
     }
     ::android::hardware::host::RegistrationWatch watch;
     EXPECT_FALSE(watch.wait(milliseconds(0)));
     write("dev/socket/more", "");
-    EXPECT_TRUE(watch.wait(milliseconds(20'000)));
+    EXPECT_TRUE(watch.wait(milliseconds(60'000)));
 }
 
 TEST_F(RegistryTest, OwnProcessGetsTheObjectItself) {

@@ -18,8 +18,10 @@ CALLS = 10_000
 WARM_UP = 1_600
 POOL = 2
 STORM_CLIENTS = 16
-# So many answers between two restarts of a storm; BEX_STORM is how many restarts.
+# So many answers between two restarts of a storm; BEX_STORM is how many restarts. More
+# come while a restart ends: on a busy machine up to so many, or the calls would be used up too early.
 STORM_ANSWERS = 24
+STORM_SPARE = 3 * STORM_ANSWERS
 # Under proot, which halts a process at each of its system calls, a call takes fifty times as long.
 PART = {"bwrap": 1, "proot": 16}
 # A command under way: the shell and the tool, the pipe.
@@ -83,7 +85,8 @@ def test_storm(phone):
     descriptors = Gauge(phone).read().descriptors
     # Each client's call under way, and the next when it finds the service that is just ending.
     most_lost = 2 * STORM_CLIENTS
-    calls = own_answers.make_calls(kills * (STORM_ANSWERS + most_lost) + STORM_ANSWERS, random.Random(3))
+    for_each_kill = STORM_ANSWERS + STORM_SPARE + most_lost
+    calls = own_answers.make_calls(kills * for_each_kill + STORM_ANSWERS, random.Random(3))
     own_answers.journal_of(phone).unlink(missing_ok=True)
     load = Load(phone, STORM_CLIENTS, calls)
     killed = 0

@@ -102,7 +102,7 @@ def test_a_slow_tool_and_a_deadline(phone):
     """The client gives up in time, and the commands still run to their end."""
     phone.fault("wl", "wait")
     seen = phone.log.stat().st_size
-    client = phone.client("--json", "--timeout", "1", "RunTxStop", "6")
+    client = phone.client("--json", "--timeout", "3", "RunTxStop", "6")
     assert client.returncode == 5
     assert len(client.stderr.splitlines()) == 1
     answer = json.loads(client.stdout)

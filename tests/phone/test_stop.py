@@ -72,7 +72,7 @@ def test_after_a_start_that_is_still_running(phone):
     """What a stop ends while the start is at its first command, that start begins afterwards."""
     tool = phone.explain(*TRANSMIT)[0].split()[0].rpartition("/")[2]
     stage(phone, tool, "wait")
-    code, out, err = phone.call("--timeout", "0.5", *TRANSMIT)
+    code, out, err = phone.call("--timeout", "2", *TRANSMIT)
     assert (code, out) == (5, b"")
     assert err.endswith(HINT)
     wait_for((phone.root / f"phone/faults/{tool}.waiting").exists)
@@ -95,7 +95,7 @@ def test_gives_up_on_a_service_that_hangs(make_phone):
     phone = make_phone("wcn")
     stage(phone, "iwpriv", "wait")
     phone.up()
-    code, out, err = stop(phone, "--timeout", "1", "6")
+    code, out, err = stop(phone, "--timeout", "5", "6")
     assert (code, out) == (5, "the radio may be on\n")
     assert err == ("bex-wifi-client: the deadline passed while waiting for another call to end; the "
                    "radio may be on, try again: bex-wifi-client stop 6\n")
