@@ -19,18 +19,23 @@ class Folder:
 
     def __init__(self, root, path, make=False):
         self.path = f"{root}/{path}"
-        self.fd = os.open(root, os.O_RDONLY | os.O_DIRECTORY)
+        folder = os.open(root, os.O_RDONLY | os.O_DIRECTORY)
         for name in path.split("/"):
-            outer = self.fd
+            outer = folder
             try:
                 if make and name not in os.listdir(outer):
                     os.mkdir(name, 0o700, dir_fd=outer)
-                self.fd = os.open(name, os.O_RDONLY | os.O_DIRECTORY | os.O_NOFOLLOW, dir_fd=outer)
+                folder = os.open(name, os.O_RDONLY | os.O_DIRECTORY | os.O_NOFOLLOW, dir_fd=outer)
             except OSError:
                 raise PhoneError(f"{self.path}: '{name}' is not a folder there; links are not "
                                  "followed") from None
             finally:
                 os.close(outer)
+        self.fd = folder  # open as long as this object is there
+
+    def __del__(self):
+        if hasattr(self, "fd"):
+            os.close(self.fd)
 
     def _do(self, call, name, *arguments, **options):
         try:

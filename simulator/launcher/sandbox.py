@@ -122,7 +122,8 @@ def _proot(folder, root):
     line += [_program("proot"), "-v", "-1", "-r", root, "-w", "/"]
     place, sockets = socket_folder("proot", folder)
     if place != root and os.path.isdir(f"{place}/{sockets}"):
-        if os.fstat(Folder(place, sockets).fd).st_uid != os.geteuid():
+        borrowed = Folder(place, sockets)
+        if os.fstat(borrowed.fd).st_uid != os.geteuid():
             raise PhoneError(f"{place}/{sockets} belongs to another user")
         line += ["-b", f"{place}/{sockets}:/dev/socket"]
     for device in _borrowed_devices(root):

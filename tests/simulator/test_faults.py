@@ -9,6 +9,7 @@ import subprocess
 import pytest
 
 from conftest import Launcher, wait_until
+from launcher import faults
 
 TOOLS = ("busybox", "cat", "getprop", "ifconfig", "iw", "setprop", "sleep", "wl")
 
@@ -23,6 +24,14 @@ def test_every_tool_obeys(phone):
         phone.fault(tool, "clear")
     assert os.listdir(phone.root / "phone/faults") == []
     assert phone.output("cat /vendor/build.prop; getprop log.tag").endswith("D")
+
+
+def test_staging_keeps_nothing_open(phone):
+    """A program that stages thousands of faults itself has descriptors for them."""
+    before = os.listdir("/proc/self/fd")
+    for actions in (["wait", "exit", "1"], ["clear"]):
+        faults.stage(str(phone.folder), "wl", actions)
+    assert len(os.listdir("/proc/self/fd")) == len(before)
 
 
 def test_a_tool_dies_by_a_signal(phone):
