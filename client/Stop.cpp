@@ -7,6 +7,7 @@
 #include <memory>
 #include <mutex>
 #include <thread>
+#include <utility>
 
 namespace vendor::korvan::bex::wifi::client {
 namespace {
@@ -35,8 +36,8 @@ struct Proof {
 const std::vector<Proof> kProofs = {{"broadcom", {"snifferStop"}}};
 const std::vector<std::string> kProofOfOthers = {"RunTxStStop", "snifferStop"};
 
-// A question and a call run at the same time. If the answer takes less than this part of the call's
-// time, the question has not waited for the call's end.
+// Questions and a call run at the same time. If each answer follows the one before within this part
+// of the call's time, no question has waited for the call's end.
 constexpr int kPromptly = 4;
 
 /** What the worker reports; the caller may give up at any time. */
@@ -90,35 +91,43 @@ class Work {
         });
     }
 
-    /** Asks the service until the work is done; returns the time of the slowest answer. */
-    Clock::duration slowestAnswerDuring(std::function<void()> work) {
-        Clock::duration slowest{};
+    /**
+     * Asks the service until the work is done; returns the longest time without an answer. It
+     * counts even when this thread had no processor to ask: what it missed proves nothing.
+     */
+    Clock::duration longestSilenceDuring(std::function<void()> work) {
+        Clock::duration longest{};
+        Clock::time_point heard = Clock::now();
+        const auto hear = [&longest, &heard] {
+            const Clock::time_point now = Clock::now();
+            longest = std::max(longest, now - std::exchange(heard, now));
+        };
         Worker worker(std::move(work));
         if (worker.error() != 0) mError = "no second thread can be started";
         while (mError.empty() && !worker.done()) {
-            const Clock::time_point asked = Clock::now();
             const auto answer = mService->isMimoSupport();
             if (!answer.isOk()) mError = answer.description();
-            slowest = std::max(slowest, Clock::now() - asked);
+            hear();
             std::this_thread::sleep_for(kBetweenQuestions);
         }
+        hear();
         if (mError.empty()) worker.join();
-        return slowest;
+        return longest;
     }
 
     /** Whether the service seems to be in no other call. Changes nothing. */
     bool isAlone() {
         const Clock::time_point begin = Clock::now();
-        const Clock::duration slowest =
-                slowestAnswerDuring([service = mService] { service->getWlanMode().isOk(); });
-        return slowest < (Clock::now() - begin) / kPromptly;
+        const Clock::duration silence =
+                longestSilenceDuring([service = mService] { service->getWlanMode().isOk(); });
+        return silence < (Clock::now() - begin) / kPromptly;
     }
 
     /** Makes all calls once; tells whether the service was in no other call meanwhile. */
     bool makeCalls() {
         set([](Stopped* stopped) { stopped->calls.clear(); });
         const auto longest = std::make_shared<Clock::duration>();
-        const Clock::duration slowest = slowestAnswerDuring(
+        const Clock::duration silence = longestSilenceDuring(
                 [shared = mShared, service = mService, channel = mChannel, longest] {
                     for (const char* method : kMethods) {
                         const Clock::time_point begin = Clock::now();
@@ -134,7 +143,7 @@ class Work {
         for (const StopCall& call : mShared->stopped.calls) {
             if (!call.answer.delivered) mError = call.answer.transportError;
         }
-        return slowest < *longest / kPromptly;
+        return silence < *longest / kPromptly;
     }
 
     /** Whether the calls that were made last prove that the radio is off. */
