@@ -67,7 +67,6 @@ def test_ends_whatever_runs(phone):
         assert phone.call("getWlanMode")[1] == b"0\n"
 
 
-
 def test_after_a_start_that_is_still_running(phone):
     """What a stop ends while the start is at its first command, that start begins afterwards."""
     tool = phone.explain(*TRANSMIT)[0].split()[0].rpartition("/")[2]
