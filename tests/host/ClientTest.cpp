@@ -36,7 +36,7 @@ class Recipient : public hidl_death_recipient {
                   static_cast<ssize_t>(sizeof(notice)));
     }
     /** The next notice's cookie, 0 when none comes in time. */
-    uint64_t notice(int patienceMs = 20'000) {
+    uint64_t notice(int patienceMs = 60'000) {
         pollfd ready = {mRead.get(), POLLIN, 0};
         uint64_t cookie = 0;
         if (poll(&ready, 1, patienceMs) == 1 && read(mRead.get(), &cookie, sizeof(cookie)) < 0) {

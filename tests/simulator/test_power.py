@@ -38,7 +38,7 @@ def test_down_leaves_no_process_and_no_file(any_phone):
     sleeping = any_phone.start(f"{ASK} 'sleep {ENDLESS}'")
     wait_until(any_phone.sleepers)
     any_phone.do("down")
-    assert sleeping.wait(10) == 0  # its service has gone
+    assert sleeping.wait(60) == 0  # its service has gone
     assert any_phone.processes() == []
     assert not any_phone.borrowed_folder().exists()
     assert not [path for number in inside
@@ -113,7 +113,7 @@ def test_killing_a_run_takes_everything_inside_with_it(any_new_phone, victim, nu
     for _ in range(("launcher", "holder", "sandbox").index(victim)):
         pid = int(pathlib.Path(f"/proc/{pid}/task/{pid}/children").read_text().split()[0])
     os.kill(pid, number)
-    call.wait(10)
+    call.wait(60)
     wait_until(lambda: any_new_phone.processes() == [])
     if victim == "sandbox":
         assert not list(pathlib.Path("/tmp").glob(f"prooted-{pid}-*"))
