@@ -7,6 +7,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <ostream>
 #include <regex>
 #include <set>
 #include <sstream>
@@ -16,6 +17,15 @@
 #include "client/doctor/PhoneChecks.h"
 #include "recorder/RecordedShell.h"
 #include "service/WifiService.h"
+
+namespace vendor::korvan::bex::wifi {
+
+// By its name where GoogleTest prints a family, instead of the bytes of its object.
+static void PrintTo(const ChipFamily& family, std::ostream* out) {
+    *out << family.name;
+}
+
+} // namespace vendor::korvan::bex::wifi
 
 namespace vendor::korvan::bex::wifi::client {
 namespace {
