@@ -9,7 +9,7 @@
 #include <cstring>
 #include <string_view>
 
-#include "client/base/Json.h"
+#include "client/base/Text.h"
 
 namespace vendor::korvan::bex::wifi::client {
 namespace {
@@ -35,7 +35,7 @@ bool readTimeout(const std::string& text, CommandLine* line, std::string* proble
     const double seconds = isDecimal(text) ? strtod(text.c_str(), nullptr) : 0;
     if (!(seconds > 0 && seconds <= kLongestTimeout)) {
         *problem = "--timeout takes a decimal number of seconds above 0 and up to 1000000, not " +
-                   jsonString(text);
+                   quote(text);
         return false;
     }
     line->timeout = std::chrono::duration_cast<std::chrono::nanoseconds>(
@@ -73,7 +73,7 @@ bool readCommandLine(const std::vector<std::string>& arguments, CommandLine* lin
             }
             if (!readTimeout(*argument, line, problem)) return false;
         } else {
-            *problem = "unknown option " + jsonString(*argument) +
+            *problem = "unknown option " + quote(*argument) +
                        " (an argument that begins with \"-\" goes after \"--\")";
             return false;
         }

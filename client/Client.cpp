@@ -13,6 +13,7 @@
 #include "client/Help.h"
 #include "client/Stop.h"
 #include "client/base/Json.h"
+#include "client/base/Text.h"
 #include "client/doctor/PhoneChecks.h"
 
 namespace vendor::korvan::bex::wifi::client {
@@ -186,7 +187,7 @@ int call(const CommandLine& line, const Surroundings& to) {
     Report report = judge(request, outcome);
     if (report.exitCode == kSuccess && line.requireCount && !packetCount(outcome.answer.text)) {
         report = {kNoCount, std::string(request.command->name) +
-                                    " answered no count: " + jsonString(outcome.answer.text)};
+                                    " answered no count: " + quote(outcome.answer.text)};
     }
 
     std::string text;

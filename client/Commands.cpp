@@ -14,7 +14,7 @@
 #include <optional>
 
 #include "client/MethodCall.h"
-#include "client/base/Json.h"
+#include "client/base/Text.h"
 
 namespace vendor::korvan::bex::wifi::client {
 namespace {
@@ -275,7 +275,7 @@ std::vector<std::string> warningsOf(const Request& request) {
             warnings.push_back(std::string(kind.name) +
                                " is empty: on most chips the command line ends there");
         } else if (kind.isKnown != nullptr && !kind.isKnown(text)) {
-            warnings.push_back(std::string(kind.name) + " " + jsonString(text) +
+            warnings.push_back(std::string(kind.name) + " " + quote(text) +
                                " is none that a chip knows (" + kind.accepted + ")");
         }
     }
@@ -303,7 +303,7 @@ std::string unknownCommand(const std::string& name) {
             nearest = &command;
         }
     }
-    const std::string problem = "unknown method " + jsonString(name);
+    const std::string problem = "unknown method " + quote(name);
     return nearest == nullptr ? problem : problem + ", perhaps " + nearest->name;
 }
 
@@ -329,7 +329,7 @@ bool readRequest(const std::vector<std::string>& words, Request* request, std::s
             const std::optional<bool> flag = readFlag(value.text);
             if (!flag) {
                 *problem = std::string(command->arguments[i]->name) +
-                           " is true, false, 1 or 0, not " + jsonString(value.text);
+                           " is true, false, 1 or 0, not " + quote(value.text);
                 return false;
             }
             value.flag = *flag;

@@ -6,6 +6,7 @@
 #include <android-base/strings.h>
 
 #include "client/base/Json.h"
+#include "client/base/Text.h"
 #include "client/base/Version.h"
 
 namespace vendor::korvan::bex::wifi::client {
@@ -80,24 +81,11 @@ do not.
 )"},
 };
 
-constexpr size_t kColumns = 80;
 constexpr size_t kNameWidth = 16;
 
 std::string padded(std::string text) {
     if (text.size() < kNameWidth) text.resize(kNameWidth, ' ');
     return text;
-}
-
-/** The text in lines of at most kColumns where words allow it, the later ones indented. */
-std::string wrapped(std::string text, size_t indent) {
-    size_t begin = 0; // of the last line
-    while (text.size() - begin > kColumns) {
-        const size_t blank = text.rfind(' ', begin + kColumns);
-        if (blank == std::string::npos || blank <= begin + indent) break;
-        text.replace(blank, 1, "\n" + std::string(indent, ' '));
-        begin = blank + 1;
-    }
-    return text + "\n";
 }
 
 const char* typeName(ArgumentKind::Type type) {

@@ -431,6 +431,29 @@ TEST_F(ClientTest, StrictRefusesWhatNoChipKnows) {
     EXPECT_EQ(run({"--strict", "RunTxNStart", "14", "80", "15", "any", "true", "any"}), 0);
 }
 
+TEST_F(ClientTest, AMessageQuotesOnlyTheBeginOfALongText) {
+    const std::string tooLong(100'000, '6');
+    const std::string quote = "\"" + tooLong.substr(0, 40) + "\"... (100000 bytes)";
+    const auto errorOf = [this](const Words& arguments, int exitCode) {
+        mErr.str("");
+        EXPECT_EQ(run(arguments), exitCode);
+        return err();
+    };
+    EXPECT_THAT(errorOf({"RunTxStop", tooLong}, 0),
+                IsOneLineWith("warning: channel " + quote + " is none that a chip knows"));
+    EXPECT_THAT(mService->calls, ElementsAre(Words{"RunTxStop", tooLong}));
+    EXPECT_THAT(errorOf({"--strict", "RunTxStop", tooLong}, 2),
+                IsOneLineWith("channel " + quote + " is none that a chip knows"));
+    EXPECT_THAT(errorOf({"RunRxNStart", "6", "20", "7", tooLong, "1"}, 2),
+                IsOneLineWith("vht is true, false, 1 or 0, not " + quote));
+    EXPECT_THAT(errorOf({tooLong}, 2), IsOneLineWith("unknown method " + quote));
+    EXPECT_THAT(errorOf({"--" + tooLong}, 2), IsOneLineWith("\"... (100002 bytes) (an argument"));
+    EXPECT_THAT(errorOf({"--timeout", tooLong, "list"}, 2), IsOneLineWith(", not " + quote));
+    mService->text = tooLong + " packets";
+    EXPECT_THAT(errorOf({"--require-count", "RunRxStop", "6"}, 7),
+                IsOneLineWith("answered no count: \"" + tooLong.substr(0, 40) + "\"... ("));
+}
+
 TEST_F(ClientTest, JsonOfALargeTextIsOneLine) {
     mService->text = std::string(300'000, '\n');
     EXPECT_EQ(run({"--json", "RunRxStop", "6"}), 0);
