@@ -5,6 +5,7 @@
 
 #include <android-base/strings.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <cstring>
 
@@ -59,16 +60,23 @@ int conclude(const Surroundings& to, const std::string& text, const Report& repo
  */
 template <typename Wait>
 auto watched(const std::string& doing, const Surroundings& to, Wait wait) {
-    std::string shown;
+    size_t widest = 0;
+    const auto show = [&](std::string text) {
+        // The last column stays free, since some terminals begin a new line once it is filled.
+        const size_t room = std::max<size_t>(to.columns(), 1) - 1;
+        text.resize(std::min(text.size(), room));
+        widest = std::max(widest, text.size());
+        to.err << '\r' << text << std::flush;
+    };
     Progress progress{to.second, nullptr};
-    if (to.terminal) {
-        progress.tick = [&](long seconds) {
-            shown = doing + ": " + std::to_string(seconds) + " s";
-            to.err << '\r' << shown << std::flush;
-        };
+    if (to.columns) {
+        progress.tick = [&](long seconds) { show(doing + ": " + std::to_string(seconds) + " s"); };
     }
     auto result = wait(progress);
-    if (!shown.empty()) to.err << '\r' << std::string(shown.size(), ' ') << '\r' << std::flush;
+    if (widest != 0) {
+        show(std::string(widest, ' '));
+        to.err << '\r' << std::flush;
+    }
     return result;
 }
 

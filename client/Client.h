@@ -4,6 +4,7 @@
 #pragma once
 
 #include <chrono>
+#include <functional>
 #include <ostream>
 #include <string>
 #include <vector>
@@ -26,8 +27,11 @@ struct Surroundings {
     FindService tryFind;
     /** Waits for a service that is declared but does not run yet. */
     FindService awaitFind;
-    /** Whether err is a terminal: then a slow call shows there how long it takes. */
-    bool terminal = false;
+    /**
+     * The columns of the terminal where somebody watches err, at the moment: then a slow call shows
+     * there how long it takes. Null without a terminal.
+     */
+    std::function<size_t()> columns = nullptr;
     /** How often that display counts one second more; only tests change it. */
     std::chrono::nanoseconds second = std::chrono::seconds(1);
     /** Where the doctor looks. */

@@ -5,19 +5,23 @@
 
 #include <android-base/strings.h>
 
-#include "chips/MethodUse.h"
+#include "client/base/Text.h"
 
 namespace vendor::korvan::bex::wifi::client {
 
 std::string familyHelp(const ChipFamily* family, const Command& command) {
     if (family == nullptr) return "";
-    std::string text = std::string("\nChip family of this phone: ") + family->name + "\n";
     const MethodUse* use = findMethodUse(family->name, command.name);
-    if (use == nullptr) return text;
-    if (!use->ignored.empty()) {
-        text += "  ignored: " + ::android::base::Join(use->ignored, ", ") + "\n";
+    return std::string("\nChip family of this phone: ") + family->name + "\n" +
+           (use == nullptr ? "" : useHelp(*use));
+}
+
+std::string useHelp(const MethodUse& use) {
+    std::string text;
+    if (!use.ignored.empty()) {
+        text += wrapped("  ignored: " + ::android::base::Join(use.ignored, ", "), 4);
     }
-    for (std::string_view remark : use->remarks) text.append("  ").append(remark).append("\n");
+    for (std::string_view remark : use.remarks) text += wrapped("  " + std::string(remark), 4);
     return text;
 }
 

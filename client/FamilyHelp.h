@@ -6,6 +6,7 @@
 #include <string>
 
 #include "chips/ChipFamily.h"
+#include "chips/MethodUse.h"
 #include "client/Commands.h"
 
 namespace vendor::korvan::bex::wifi::client {
@@ -17,5 +18,8 @@ namespace vendor::korvan::bex::wifi::client {
  * @param family Null for a phone that names no known vendor; then the text is empty.
  */
 std::string familyHelp(const ChipFamily* family, const Command& command);
+
+/** The lines on what a family makes of a method, at most 80 columns each. */
+std::string useHelp(const MethodUse& use);
 
 } // namespace vendor::korvan::bex::wifi::client

@@ -60,7 +60,7 @@ struct Topic {
 
 constexpr Topic kTopics[] = {
         {"list", R"(Usage: bex-wifi-client list [--json]
-Names the methods, a line for each. With --json also their arguments and
+Names the methods and what each does. With --json also their arguments and
 results.
 )"},
         {"doctor", R"(Usage: bex-wifi-client doctor [--json] [--timeout SECONDS]
@@ -176,7 +176,7 @@ std::string versionText() {
 std::string listText() {
     std::string lines;
     for (const Command& command : commands()) {
-        lines += padded(command.name) + command.summary + "\n";
+        lines += wrapped(padded(command.name) + command.summary, kNameWidth);
     }
     return lines;
 }

@@ -30,7 +30,7 @@ std::optional<std::string> helpOnTopic(const std::string& name);
 /** The client's version, and the interface that it was built for. */
 std::string versionText();
 
-/** A line for each method: its name and summary. */
+/** Each method's name and summary, in lines of at most 80 columns. */
 std::string listText();
 
 /**

@@ -9,9 +9,11 @@
 #include <iostream>
 
 #include "client/Client.h"
+#include "client/Terminal.h"
 
 using vendor::korvan::bex::wifi::client::IWifiService;
 using vendor::korvan::bex::wifi::client::runClient;
+using vendor::korvan::bex::wifi::client::terminalColumns;
 
 namespace {
 
@@ -32,10 +34,11 @@ int main(int argc, char** argv) {
     // the same.
     __android_log_set_minimum_priority(ANDROID_LOG_SILENT);
     const std::vector<std::string> arguments(argv + (argc > 0), argv + argc);
-    const int exitCode =
-            runClient(arguments,
-                      {std::cout, std::cerr, [] { return IWifiService::tryGetService(); },
-                       [] { return IWifiService::getService(); }, isatty(STDERR_FILENO) != 0});
+    std::function<size_t()> columns;
+    if (isatty(STDERR_FILENO) != 0) columns = [] { return terminalColumns(STDERR_FILENO); };
+    const int exitCode = runClient(arguments, {std::cout, std::cerr,
+                                               [] { return IWifiService::tryGetService(); },
+                                               [] { return IWifiService::getService(); }, columns});
     // Everything is flushed; a thread may still wait for the service (see base/Worker.h).
     _exit(exitCode);
 }

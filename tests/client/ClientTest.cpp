@@ -47,7 +47,7 @@ std::string withoutCourse(const std::string& json) {
 class ClientTest : public ::testing::Test {
   protected:
     int run(const Words& arguments) {
-        return runClient(arguments, {mOut, mErr, mTryFind, mAwaitFind, mTerminal, mSecond});
+        return runClient(arguments, {mOut, mErr, mTryFind, mAwaitFind, mColumns, mSecond});
     }
 
     std::string out() const { return mOut.str(); }
@@ -64,7 +64,7 @@ class ClientTest : public ::testing::Test {
         ++mAwaited;
         return mService;
     };
-    bool mTerminal = false;
+    std::function<size_t()> mColumns;
     std::chrono::nanoseconds mSecond = 1s;
     std::ostringstream mOut;
     std::ostringstream mErr;
@@ -531,14 +531,33 @@ TEST_F(ClientTest, ATerminalShowsTheSecondsInPlaceAndErasesThemBeforeTheResult) 
     mService->onCall = [gate = release.get_future().share()] { gate.wait(); };
     WatchedBuffer buffer(": 3 s", &release);
     std::ostream screen(&buffer); // Both streams, as a terminal shows them.
-    EXPECT_EQ(runClient({"RunTxStop", "6"}, {screen, screen, mTryFind, mAwaitFind, true, 50ms}), 0);
+    EXPECT_EQ(runClient({"RunTxStop", "6"},
+                        {screen, screen, mTryFind, mAwaitFind, [] { return 80; }, 50ms}),
+              0);
     EXPECT_THAT(buffer.str(), ::testing::MatchesRegex("\rRunTxStop: 1 s\rRunTxStop: 2 s"
                                                       "\rRunTxStop: 3 s(\rRunTxStop: [0-9]+ s)*"
                                                       "\r {14,}\r0\n"));
 }
 
+// The last column stays free, since some terminals begin a new line once it is filled.
+TEST_F(ClientTest, ANarrowTerminalShowsWhatFitsWhateverItsWidthBecomes) {
+    std::promise<void> release;
+    mService->onCall = [gate = release.get_future().share()] { gate.wait_for(60s); };
+    std::ostringstream screen;
+    size_t ticks = 0;
+    const auto columns = [&ticks, &release]() -> size_t {
+        constexpr size_t kWidths[] = {14, 13, 5, 1};
+        if (ticks == 4) release.set_value();
+        return kWidths[std::min<size_t>(ticks++, 3)];
+    };
+    EXPECT_EQ(runClient({"RunTxStop", "6"}, {screen, screen, mTryFind, mAwaitFind, columns, 50ms}),
+              0);
+    EXPECT_THAT(screen.str(), ::testing::MatchesRegex("\rRunTxStop: 1 \rRunTxStop: 2\rRunT\r+"
+                                                      "0\n"));
+}
+
 TEST_F(ClientTest, ATerminalShowsNothingOfAShortCall) {
-    mTerminal = true;
+    mColumns = [] { return 80; };
     mSecond = 1h;
     EXPECT_EQ(run({"RunTxStop", "6"}), 0);
     EXPECT_EQ(err(), "");

@@ -36,7 +36,7 @@ class DoctorCommandTest : public DoctorTest {
                                      mErr,
                                      mTryFind,
                                      mTryFind,
-                                     false,
+                                     nullptr,
                                      1s,
                                      {[this] { return mManager; }, root()}});
     }

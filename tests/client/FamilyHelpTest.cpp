@@ -74,5 +74,18 @@ TEST(FamilyHelpTest, FitsInEightyColumns) {
     }
 }
 
+TEST(FamilyHelpTest, LongLinesAreWrapped) {
+    EXPECT_EQ(useHelp({"RunTxNStart",
+                       {},
+                       {"channel", "bandwidth", "rate", "power", "vht", "guardInterval", "antenna",
+                        "address", "ssid"},
+                       {"Transmits nothing: no test command follows what sets the chip up, and the "
+                        "rest of it."}}),
+              "  ignored: channel, bandwidth, rate, power, vht, guardInterval, antenna,\n"
+              "    address, ssid\n"
+              "  Transmits nothing: no test command follows what sets the chip up, and the rest\n"
+              "    of it.\n");
+}
+
 } // namespace
 } // namespace vendor::korvan::bex::wifi::client

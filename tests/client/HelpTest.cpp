@@ -24,7 +24,7 @@ std::string inOneLine(const std::string& text) {
 }
 
 TEST(HelpTest, FitsIntoEightyColumns) {
-    std::string all = helpText() + versionText();
+    std::string all = helpText() + versionText() + listText();
     for (const char* topic : {"list", "doctor", "stop"}) all += helpOnTopic(topic).value();
     for (const Command& command : commands()) all += helpText(command);
     for (const std::string& line : ::android::base::Split(all, "\n")) {
@@ -119,10 +119,17 @@ TEST(HelpTest, AMethodsHelpReadsLikeThis) {
               "Example: bex-wifi-client RunRxNStart 6 20 7 false 1\n");
 }
 
-TEST(HelpTest, TheListHasALineForEachMethod) {
+TEST(HelpTest, TheListHasEachMethodAndItsSummary) {
     const std::string list = listText();
-    EXPECT_EQ(std::count(list.begin(), list.end(), '\n'), 16);
-    EXPECT_THAT(list, StartsWith("snifferStart    Puts the driver into monitor mode"));
+    EXPECT_THAT(list,
+                StartsWith("snifferStart    Puts the driver into monitor mode on a channel and "
+                           "starts the\n"
+                           "                packet capture.\n"
+                           "snifferStop     Ends the packet capture"));
+    for (const Command& command : commands()) {
+        EXPECT_THAT("\n" + list, HasSubstr("\n" + std::string(command.name) + " "));
+        EXPECT_THAT(inOneLine(list), HasSubstr(command.summary));
+    }
     EXPECT_THAT(list, HasSubstr("\nRunRxStop       Ends the reception and reads its packet "
                                 "count.\n"));
 }

@@ -6,13 +6,17 @@ BEX_WIFI_CLIENT names the program, SERVED_FAKE a service for it. Each test has a
 own, in which the service is declared.
 """
 
+import contextlib
 import json
 import os
 import pathlib
+import pty
+import re
 import resource
 import signal
 import subprocess
 import tempfile
+import termios
 
 import pytest
 
@@ -139,6 +143,26 @@ def test_a_signal_ends_a_call(service, number):
     assert (client.returncode, out) == (128 + number, b"")
     assert err.startswith(b"bex-wifi-client: RunTxStop was interrupted by ")
     assert err.count(b"\n") == 1
+
+
+@pytest.mark.usefixtures("service")
+@pytest.mark.parametrize("columns, variable", [(10, "40"), (0, "10")], ids=["terminal", "COLUMNS"])
+def test_a_narrow_terminal_shows_what_fits(columns, variable):
+    """A terminal of no columns is one that does not know its size."""
+    screen, terminal = pty.openpty()
+    termios.tcsetwinsize(terminal, (24, columns))
+    with subprocess.Popen([CLIENT, "RunTxStop", HANG], stdout=subprocess.DEVNULL, stderr=terminal,
+                          env={**os.environ, "COLUMNS": variable}) as client:
+        os.close(terminal)
+        shown = b""
+        while b"RunTxStop" not in shown:
+            shown += os.read(screen, 100)
+        client.send_signal(signal.SIGINT)
+        with contextlib.suppress(OSError):  # A terminal's end is an error.
+            while more := os.read(screen, 100):
+                shown += more
+    os.close(screen)
+    assert re.fullmatch(rb"(\rRunTxStop)+\r {9}\rbex-wifi-client: .*\r\n", shown)
 
 
 @pytest.mark.usefixtures("service")
