@@ -14,6 +14,7 @@
 #include "client/Help.h"
 #include "client/Stop.h"
 #include "client/base/Json.h"
+#include "client/base/Logcat.h"
 #include "client/base/Text.h"
 #include "client/doctor/PhoneChecks.h"
 
@@ -118,9 +119,8 @@ Report judgeStop(const std::string& channel, const Stopped& stopped) {
     const std::string again = stopCommandLine(channel);
     Report report = judgeUnanswered("stop", stopped.outcome);
     if (stopped.outcome.ending == Ending::answered) {
-        report = {kFailed,
-                  "the calls do not prove that the radio is off: which command failed is in the "
-                  "service's log (logcat, tags that begin with \"wifi@1.0-\")"};
+        report = {kFailed, std::string("the calls do not prove that the radio is off: ") +
+                                   kWhichCommandFailed + ": " + logcat()};
     } else if (stopped.outcome.ending == Ending::late && stopped.outcome.stage == Stage::call &&
                !stopped.alone) {
         report.error = "the deadline passed while waiting for another call to end";

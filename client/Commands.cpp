@@ -14,6 +14,7 @@
 #include <optional>
 
 #include "client/MethodCall.h"
+#include "client/base/Logcat.h"
 #include "client/base/Text.h"
 
 namespace vendor::korvan::bex::wifi::client {
@@ -78,17 +79,15 @@ constexpr ArgumentKind
     kAddress{"address", kText, "the IPv4 address to give to the interface", "", "dotted decimal",
              "192.168.1.7"};
 
-constexpr char kCommandLog[] =
-    "which command failed is in the service's log (logcat, tags that begin with \"wifi@1.0-\")";
 constexpr char kModeLog[] =
-    "the driver is in another mode or its mode cannot be read: see the service's log (logcat, tag "
-    "\"wifi@1.0-SnifferTool\")";
+    "the driver is in another mode or its mode cannot be read: see the service's log, tag "
+    "\"wifi@1.0-SnifferTool\"";
 
 constexpr ResultKind
     kStatus{ResultKind::Type::int32,
             "0 when every command succeeded, -1 when at least one failed; some chip families tolerate "
             "an insmod that fails",
-            "-1", kCommandLog},
+            "-1", kWhichCommandFailed},
     kMode{ResultKind::Type::int32,
           "0 (normal), 4 (monitor) or 5 (factory test); -1 for any other number and when the mode "
           "cannot be read; text that is no number reads as 0", "-1", kModeLog},
@@ -97,13 +96,13 @@ constexpr ResultKind
     kMimo{ResultKind::Type::boolean, "true when the device declares MIMO support", "", ""},
     kStarted{ResultKind::Type::text,
              "\"ok\" or \"failure\", or the packet count at the start, as the chip family defines",
-             "failure", kCommandLog, true},
+             "failure", kWhichCommandFailed, true},
     kAxStarted{ResultKind::Type::text,
                "\"ok\" or \"failure\"; one blank on the WCN chips, which only enter test mode",
-               "failure", kCommandLog, true},
+               "failure", kWhichCommandFailed, true},
     kPackets{ResultKind::Type::text,
              "the packets received, in decimal; on most Qualcomm chips with \"Rx: \" in front; no "
-             "number when the chip's tool printed none", "failure", kCommandLog, true};
+             "number when the chip's tool printed none", "failure", kWhichCommandFailed, true};
 // clang-format on
 
 const std::vector<Command> kCommands = {

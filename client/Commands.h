@@ -45,7 +45,7 @@ struct ResultKind {
     const char* meaning;
     /** The answer, as printed, that tells of a failure; empty where no answer does. */
     const char* failure;
-    /** Where to look after that answer. */
+    /** What to look for in the log after that answer. */
     const char* advice;
     /** Whether it may hold a count of packets. */
     bool counts = false;

@@ -9,6 +9,7 @@
 #include <ctime>
 
 #include "client/Help.h"
+#include "client/base/Logcat.h"
 #include "client/base/Version.h"
 
 namespace vendor::korvan::bex::wifi::client {
@@ -62,7 +63,7 @@ Report judgeAnswer(const Request& request, const Outcome& outcome) {
     if (outcome.ending != Ending::answered) return judgeUnanswered(request.command->name, outcome);
     if (!request.command->tellsFailure(outcome.answer)) return {};
     return {kFailed, std::string(request.command->name) + " answered " + outcome.answer.text +
-                             ": " + request.command->result->advice};
+                             ": " + request.command->result->advice + ": " + logcat()};
 }
 
 } // namespace

@@ -13,6 +13,7 @@
 
 #include "chips/ModuleFiles.h"
 #include "client/base/Json.h"
+#include "client/base/Logcat.h"
 #include "client/doctor/PhoneFiles.h"
 
 namespace vendor::korvan::bex::wifi::client {
@@ -28,11 +29,13 @@ constexpr char kMimo[] = "ro.hardware.wlan.mimo";
 
 constexpr char kVendorBin[] = "/vendor/bin/";
 constexpr char kShell[] = "/vendor/bin/sh";
-constexpr char kExecuteDenied[] =
-        "; when it is there and commands still fail, \"execute\" is denied: logcat | grep avc";
-constexpr char kInsmodDenied[] =
+const std::string kExecuteDenied =
+        "; when it is there and commands still fail, \"execute\" is denied: " +
+        logcat(" | grep avc");
+const std::string kInsmodDenied =
         "; when insmod is refused, the service lacks the capability sys_module, or \"module_load\" "
-        "for the file's label: logcat | grep avc";
+        "for the file's label: " +
+        logcat(" | grep avc");
 
 // Where the service's shell looks for a bare name, as the init script says. A vendor process may
 // execute only programs in the vendor's own folders, unless its policy makes an exception.
@@ -100,7 +103,7 @@ Check checkShell(const std::string& root) {
 
 Check missingTool(const std::string& name, const std::string& tool) {
     return problem(name, tool + " is not there: calls that use it answer -1, failure or no count",
-                   "install it in /vendor/bin with mode 755" + std::string(kExecuteDenied));
+                   "install it in /vendor/bin with mode 755" + kExecuteDenied);
 }
 
 Check checkPath(const std::string& root, const std::string& path) {
@@ -131,7 +134,8 @@ Check checkName(const std::string& root, const std::string& tool) {
                        "only as " + std::string(folder) + tool +
                                ", which a vendor process may usually not execute",
                        "install it in /vendor/bin, or see that a call with it succeeds; refusals "
-                       "are in: logcat | grep avc");
+                       "are in: " +
+                               logcat(" | grep avc"));
     }
     if (!unusable.empty()) return notExecutable(name, unusable);
     return hidden ? *hidden : missingTool(name, tool);
@@ -187,9 +191,9 @@ Check checkParameter(const std::string& root, const DriverFile& file) {
         return unknown(name, absent,
                        "it comes with the driver: turn Wi-Fi on, or insmod, and look "
                        "again" +
-                               std::string(kInsmodDenied));
+                               kInsmodDenied);
     }
-    return problem(name, absent, "load it, no call does" + std::string(kInsmodDenied));
+    return problem(name, absent, "load it, no call does" + kInsmodDenied);
 }
 
 Check checkImage(const std::string& root, const std::string& path) {
@@ -266,7 +270,8 @@ Check checkCommandLog() {
         remedies.push_back("setprop " + (cause == persistent ? persistent : "log.tag." + tag) +
                            " D");
     }
-    if (remedies.empty()) return ok("command-log", "logcat | grep 'cmd:' shows which commands run");
+    if (remedies.empty())
+        return ok("command-log", logcat(" | grep 'cmd:'") + " shows which commands run");
     return problem("command-log", found + "the log does not show all commands that run",
                    Join(remedies, "; "));
 }

@@ -12,6 +12,7 @@
 #include <climits>
 
 #include "client/base/Json.h"
+#include "client/base/Logcat.h"
 #include "client/base/Worker.h"
 #include "client/doctor/PhoneFiles.h"
 #include "client/doctor/Questions.h"
@@ -100,7 +101,7 @@ Check ServiceExamination::declared() {
     }
     if (!asked->error.empty()) {
         return problem(name, "the service manager cannot be asked: " + jsonString(asked->error),
-                       "run this as root; refusals are in: logcat | grep avc");
+                       "run this as root; refusals are in: " + logcat(" | grep avc"));
     }
     mTransport = asked->value;
     if (mTransport == Transport::HWBINDER) {
@@ -120,8 +121,8 @@ Check ServiceExamination::declared() {
     return problem(name,
                    "a VINTF file names it, but the service manager does not give it to this user",
                    "compare version, interface and instance in " + mManifests.files[0] +
-                           "; reboot, since manifests are read once; a denied \"find\" is in: "
-                           "logcat | grep 'avc.*hwservice_manager'");
+                           "; reboot, since manifests are read once; a denied \"find\" is in: " +
+                           logcat(" | grep 'avc.*hwservice_manager'"));
 }
 
 Check ServiceExamination::manifest() const {
@@ -174,7 +175,7 @@ Check ServiceExamination::init() {
                    std::string("start ") + kInitService +
                            "; when it does not stay: dmesg | grep -e bex -e avc (\"execute\" "
                            "denied: label " +
-                           kProgram + " as its domain's exec type), logcat -b crash");
+                           kProgram + " as its domain's exec type), " + logcat(" -b crash"));
 }
 
 Check ServiceExamination::registered() {
@@ -194,8 +195,8 @@ Check ServiceExamination::registered() {
                                "stopped; start ") +
                            kInitService +
                            "; when it runs, hwservice_contexts or its right to \"add\", or this "
-                           "user's to \"find\", is missing: logcat | grep "
-                           "'avc.*hwservice_manager'");
+                           "user's to \"find\", is missing: " +
+                           logcat(" | grep 'avc.*hwservice_manager'"));
 }
 
 Check ServiceExamination::answering() {
@@ -210,15 +211,15 @@ Check ServiceExamination::answering() {
     if (!error) {
         return problem(name, "the service is there and has not answered" + mInTime,
                        std::string("both its threads may be in calls, or wait for ever for a tool "
-                                   "that left a process behind with its output open: logcat | grep "
-                                   "wifi@1.0- shows its last command; then stop ") +
+                                   "that left a process behind with its output open: ") +
+                               logcat(" | grep wifi@1.0-") + " shows its last command; then stop " +
                                kInitService + "; start " + kInitService +
                                "; a station gives every call --timeout, and every adb a deadline "
                                "of its own");
     }
     if (!error->empty()) {
         return problem(name, "the service does not answer: " + jsonString(*error),
-                       "it has died: logcat -b crash; dmesg | grep bex");
+                       "it has died: " + logcat(" -b crash") + "; dmesg | grep bex");
     }
     mAnswers = true;
     return ok(name, "to a ping");

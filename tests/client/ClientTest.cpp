@@ -142,7 +142,7 @@ TEST_F(ClientTest, ExitCode1StillPrintsTheResult) {
     EXPECT_EQ(out(), "-1\n");
     EXPECT_EQ(err(),
               "bex-wifi-client: RunTxStop answered -1: which command failed is in the service's "
-              "log (logcat, tags that begin with \"wifi@1.0-\")\n");
+              "log, tags that begin with \"wifi@1.0-\": logcat (a simulated phone: ./dev log)\n");
 }
 
 TEST_F(ClientTest, ExitCode1ForAnUnknownMode) {
@@ -313,8 +313,8 @@ TEST_F(ClientTest, JsonOfAFailureKeepsTheValue) {
     EXPECT_EQ(withoutCourse(out()),
               R"({"schema_version":1,"method":"snifferStop","arguments":{},"ok":false,"value":-1,)"
               R"(COURSE,"exit_code":1,"error":"snifferStop answered -1: which command )"
-              "failed is in the service's log (logcat, tags that begin with "
-              "\\\"wifi@1.0-\\\")\"}\n");
+              "failed is in the service's log, tags that begin with \\\"wifi@1.0-\\\": "
+              "logcat (a simulated phone: ./dev log)\"}\n");
     EXPECT_THAT(err(), IsOneLineWith("snifferStop answered -1"));
 }
 

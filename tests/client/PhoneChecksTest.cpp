@@ -52,7 +52,8 @@ TEST_F(PhoneChecksTest, AToolThatTheShellLooksUp) {
     write("/system/bin/wl", "");
     expectOnly("tool wl", "/vendor/xbin/wl is not an executable", "chmod 755 /vendor/xbin/wl");
     writeTool("/system/bin/wl");
-    expectUnknown("tool wl", "only as /system/bin/wl", "logcat | grep avc");
+    expectUnknown("tool wl", "only as /system/bin/wl",
+                  "logcat | grep avc (a simulated phone: ./dev log)");
     writeTool("/odm/bin/wl");
     expectOk("tool wl", "/odm/bin/wl");
     remove("/vendor/xbin");

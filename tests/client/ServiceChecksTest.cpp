@@ -89,7 +89,7 @@ TEST_F(ServiceChecksTest, NotRegistered) {
 
 TEST_F(ServiceChecksTest, AServiceThatDied) {
     mService->dead = true;
-    expectOnly("answering", "DEAD_OBJECT", "logcat -b crash");
+    expectOnly("answering", "DEAD_OBJECT", "logcat -b crash (a simulated phone: ./dev log)");
 }
 
 TEST_F(ServiceChecksTest, Hash) {
