@@ -81,14 +81,18 @@ TEST_F(DescriptorsTest, ThatAreNotMemory) {
         sendBytes(peer.get(), Bytes(1), {descriptor});
         EXPECT_TRUE(isTurnedAway(peer.get()));
     }
-    // No descriptor where one is announced, and one that is not announced.
+    // No descriptor where one is announced,
     unique_fd without = connectToServer();
     sendBytes(without.get(), frame.header);
     sendBytes(without.get(), Bytes(1));
     EXPECT_TRUE(isTurnedAway(without.get()));
+    // and one that is not announced, of which an emulator's recvmsg() does not tell: no MSG_CTRUNC.
     unique_fd unannounced = connectToServer();
-    sendBytes(unannounced.get(), validFrame("text"), {disk.get()});
-    EXPECT_TRUE(isTurnedAway(unannounced.get()));
+    if (!kEmulated) {
+        sendBytes(unannounced.get(), validFrame("text"), {disk.get()});
+        EXPECT_TRUE(isTurnedAway(unannounced.get()));
+    }
+    unannounced.reset();
     EXPECT_EQ(call(service, "alive"), "alive");
     EXPECT_TRUE(comesDownTo(before));
 }
