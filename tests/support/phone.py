@@ -66,7 +66,7 @@ class Phone:
             reports = self.reports()
         finally:
             self.phone("down", self.folder)
-        assert reports == []
+        assert reports == [], "\n".join(reports)
 
     def is_up(self):
         with open(self.folder / "pid", "rb") as pid:
