@@ -5,7 +5,6 @@
 #include <signal.h>
 #include <unistd.h>
 
-#include <future>
 #include <thread>
 
 #include "FakeService.h"
@@ -77,50 +76,39 @@ TEST_F(CallTest, FindsAndCallsOffTheCallersThread) {
 }
 
 TEST_F(CallTest, TheDeadlineEndsTheSearch) {
-    std::promise<void> release;
-    std::promise<void> found;
+    Gate gate;
     const Outcome outcome = callService(
             mRequest,
-            [gate = release.get_future().share(), &found] {
+            [&gate] {
                 gate.wait();
-                found.set_value_at_thread_exit();
                 return nullptr;
             },
             50ms, kNoProgress);
     EXPECT_EQ(outcome.ending, Ending::late);
     EXPECT_EQ(outcome.stage, Stage::lookup);
     EXPECT_GE(outcome.duration, 50ms);
-
-    release.set_value();
-    found.get_future().wait();
 }
 
 TEST_F(CallTest, TheDeadlineEndsTheCallAndTheWorkerMayEndLater) {
-    std::promise<void> release;
-    std::promise<void> ended;
-    mService->onCall = [gate = release.get_future().share(), &ended] {
-        gate.wait();
-        ended.set_value_at_thread_exit();
-    };
+    Gate gate;
+    mService->onCall = [&gate] { gate.wait(); };
     const Outcome outcome = callService(mRequest, find(), 2s, kNoProgress);
     EXPECT_EQ(outcome.ending, Ending::late);
     EXPECT_EQ(outcome.stage, Stage::call);
     EXPECT_FALSE(outcome.answer.delivered);
-
-    release.set_value();
-    ended.get_future().wait();
 }
 
 TEST_F(CallTest, ASignalEndsTheCall) {
-    for (const int signal : {SIGINT, SIGTERM}) {
+    for (const int number : {SIGINT, SIGTERM}) {
+        signal(number, SIG_DFL); // The tests may run in the background of a script.
         Gate gate;
-        mService->onCall = [&gate, signal] {
-            kill(getpid(), signal);
+        mService->onCall = [&gate, number] {
+            kill(getpid(), number);
             gate.wait();
         };
         const Outcome outcome = callService(mRequest, find(), std::nullopt, kNoProgress);
         EXPECT_EQ(outcome.ending, Ending::interrupted);
-        EXPECT_EQ(outcome.number, signal);
+        EXPECT_EQ(outcome.number, number);
         EXPECT_EQ(outcome.stage, Stage::call);
     }
 }
@@ -136,13 +124,13 @@ TEST_F(CallTest, AnIgnoredSignalDoesNot) {
 }
 
 TEST_F(CallTest, TicksAreCountedOnTheCallersThreadUntilTheEnd) {
-    std::promise<void> release;
-    mService->onCall = [gate = release.get_future().share()] { gate.wait(); };
+    Gate gate;
+    mService->onCall = [&gate] { gate.wait(); };
     std::vector<long> ticks;
     const auto tick = [&, caller = std::this_thread::get_id()](long number) {
         EXPECT_EQ(std::this_thread::get_id(), caller);
         ticks.push_back(number);
-        if (number == 3) release.set_value();
+        if (number == 3) gate.open();
     };
     const Outcome outcome = callService(mRequest, find(), std::nullopt, {1ms, tick});
     EXPECT_EQ(outcome.ending, Ending::answered);

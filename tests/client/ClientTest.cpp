@@ -6,7 +6,6 @@
 #include <unistd.h>
 
 #include <algorithm>
-#include <future>
 #include <regex>
 #include <sstream>
 #include <thread>
@@ -510,26 +509,25 @@ TEST_F(ClientTest, ExitCode6WhenTheResultCannotBeWritten) {
 // Opens a gate as soon as a text has been written and flushed.
 class WatchedBuffer : public std::stringbuf {
   public:
-    WatchedBuffer(std::string text, std::promise<void>* gate)
-          : mText(std::move(text)), mGate(gate) {}
+    WatchedBuffer(std::string text, Gate* gate) : mText(std::move(text)), mGate(gate) {}
 
   private:
     int sync() override {
         if (mGate != nullptr && str().find(mText) != std::string::npos) {
-            mGate->set_value();
+            mGate->open();
             mGate = nullptr;
         }
         return 0;
     }
 
     const std::string mText;
-    std::promise<void>* mGate;
+    Gate* mGate;
 };
 
 TEST_F(ClientTest, ATerminalShowsTheSecondsInPlaceAndErasesThemBeforeTheResult) {
-    std::promise<void> release;
-    mService->onCall = [gate = release.get_future().share()] { gate.wait(); };
-    WatchedBuffer buffer(": 3 s", &release);
+    Gate gate;
+    mService->onCall = [&gate] { gate.wait(); };
+    WatchedBuffer buffer(": 3 s", &gate);
     std::ostream screen(&buffer); // Both streams, as a terminal shows them.
     EXPECT_EQ(runClient({"RunTxStop", "6"},
                         {screen, screen, mTryFind, mAwaitFind, [] { return 80; }, 50ms}),
@@ -541,13 +539,13 @@ TEST_F(ClientTest, ATerminalShowsTheSecondsInPlaceAndErasesThemBeforeTheResult) 
 
 // The last column stays free, since some terminals begin a new line once it is filled.
 TEST_F(ClientTest, ANarrowTerminalShowsWhatFitsWhateverItsWidthBecomes) {
-    std::promise<void> release;
-    mService->onCall = [gate = release.get_future().share()] { gate.wait_for(60s); };
+    Gate gate;
+    mService->onCall = [&gate] { gate.wait(); };
     std::ostringstream screen;
     size_t ticks = 0;
-    const auto columns = [&ticks, &release]() -> size_t {
+    const auto columns = [&ticks, &gate]() -> size_t {
         constexpr size_t kWidths[] = {14, 13, 5, 1};
-        if (ticks == 4) release.set_value();
+        if (ticks == 4) gate.open();
         return kWidths[std::min<size_t>(ticks++, 3)];
     };
     EXPECT_EQ(runClient({"RunTxStop", "6"}, {screen, screen, mTryFind, mAwaitFind, columns, 50ms}),

@@ -9,8 +9,8 @@
 namespace vendor::korvan::bex::wifi::client {
 
 /**
- * Where the thread that a passed deadline leaves behind waits until the end of the test. One thread
- * comes to it.
+ * Where one thread waits until it is let through, at the latest at the end of the test, which waits
+ * for the thread to end: a passed deadline leaves such a thread behind.
  */
 class Gate {
   public:
@@ -19,6 +19,12 @@ class Gate {
         mOpen = true;
         mChanged.notify_all();
         mChanged.wait(lock, [this] { return mLeft; });
+    }
+
+    void open() {
+        const std::lock_guard<std::mutex> guard(mLock);
+        mOpen = true;
+        mChanged.notify_all();
     }
 
     void wait() {

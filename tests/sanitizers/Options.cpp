@@ -20,11 +20,4 @@ const char* __ubsan_default_options() {
 const char* __tsan_default_options() {
     return "exitcode=66:halt_on_error=1:second_deadlock_stack=1";
 }
-
-const char* __tsan_default_suppressions() {
-    // The future becomes ready inside libstdc++, at the thread's end, by an atomic that
-    // ThreadSanitizer does not see. Covers what this one function writes, nothing that its caller
-    // does.
-    return "race:^std::promise<void>::set_value_at_thread_exit\n";
-}
 }
