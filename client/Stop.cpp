@@ -17,7 +17,10 @@ using ::android::sp;
 constexpr const char* kMethods[] = {"RunTxStop", "RunTxStStop", "RunRxStop", "snifferStop"};
 constexpr int kPasses = 3;
 constexpr std::chrono::microseconds kBetweenQuestions(200);
-constexpr std::chrono::milliseconds kBetweenLooks(100);
+// Looks follow each other quickly at first: on a busy phone one may see nothing where the next one
+// does.
+constexpr std::chrono::milliseconds kFirstPause(5);
+constexpr std::chrono::milliseconds kLongestPause(100);
 
 // What the answer 0 proves, by the lines that must have succeeded for it:
 //
@@ -63,9 +66,7 @@ class Work {
         mService = find();
         if (mService == nullptr) return end(Ending::notFound);
         set([](Stopped* stopped) { stopped->outcome.stage = Stage::call; });
-        while (!makeCalls() && mError.empty()) {
-            while (!isAlone() && mError.empty()) std::this_thread::sleep_for(kBetweenLooks);
-        }
+        while (!makeCalls() && mError.empty()) waitUntilAlone();
         set([](Stopped* stopped) { stopped->alone = true; });
         for (int pass = 0; pass < kPasses && mError.empty(); ++pass) {
             makeCalls();
@@ -92,12 +93,14 @@ class Work {
     }
 
     /**
-     * Asks the service until the work is done; returns the longest time without an answer. It
+     * Runs the work, which is a call, and asks the service until it is done; tells whether the
+     * service was in no other call at that time. The longest time without an answer decides. It
      * counts even when this thread had no processor to ask: what it missed proves nothing.
      */
-    Clock::duration longestSilenceDuring(std::function<void()> work) {
+    bool isAloneDuring(std::function<void()> work) {
+        const Clock::time_point begin = Clock::now();
         Clock::duration longest{};
-        Clock::time_point heard = Clock::now();
+        Clock::time_point heard = begin;
         const auto hear = [&longest, &heard] {
             const Clock::time_point now = Clock::now();
             longest = std::max(longest, now - std::exchange(heard, now));
@@ -112,38 +115,38 @@ class Work {
         }
         hear();
         if (mError.empty()) worker.join();
-        return longest;
+        return mError.empty() && longest < (Clock::now() - begin) / kPromptly;
     }
 
-    /** Whether the service seems to be in no other call. Changes nothing. */
-    bool isAlone() {
-        const Clock::time_point begin = Clock::now();
-        const Clock::duration silence =
-                longestSilenceDuring([service = mService] { service->getWlanMode().isOk(); });
-        return silence < (Clock::now() - begin) / kPromptly;
+    /** Until no other call is under way. Changes nothing. */
+    void waitUntilAlone() {
+        std::chrono::milliseconds pause = kFirstPause;
+        while (!isAloneDuring([service = mService] { service->getWlanMode().isOk(); }) &&
+               mError.empty()) {
+            std::this_thread::sleep_for(pause);
+            pause = std::min(2 * pause, kLongestPause);
+        }
     }
 
-    /** Makes all calls once; tells whether the service was in no other call meanwhile. */
+    /**
+     * Makes all calls once; tells whether the service was in no other call during one of them, and
+     * so during those after it.
+     */
     bool makeCalls() {
         set([](Stopped* stopped) { stopped->calls.clear(); });
-        const auto longest = std::make_shared<Clock::duration>();
-        const Clock::duration silence = longestSilenceDuring(
-                [shared = mShared, service = mService, channel = mChannel, longest] {
-                    for (const char* method : kMethods) {
-                        const Clock::time_point begin = Clock::now();
-                        const Command& command = *findCommand(method);
-                        const std::vector<Value> values(command.arguments.size(), {channel});
-                        const Answer answer = command.call(*service, values);
-                        *longest = std::max(*longest, Clock::now() - begin);
-                        const std::lock_guard<std::mutex> guard(shared->lock);
-                        shared->stopped.calls.push_back({&command, answer});
-                    }
-                });
-        if (!mError.empty()) return false;
-        for (const StopCall& call : mShared->stopped.calls) {
-            if (!call.answer.delivered) mError = call.answer.transportError;
+        bool alone = false;
+        for (const char* method : kMethods) {
+            const Command& command = *findCommand(method);
+            const std::vector<Value> values(command.arguments.size(), {mChannel});
+            const auto answer = std::make_shared<Answer>();
+            alone |= isAloneDuring([service = mService, &command, values, answer] {
+                *answer = command.call(*service, values);
+            });
+            if (mError.empty() && !answer->delivered) mError = answer->transportError;
+            if (!mError.empty()) return false;
+            set([&](Stopped* stopped) { stopped->calls.push_back({&command, *answer}); });
         }
-        return silence < *longest / kPromptly;
+        return alone;
     }
 
     /** Whether the calls that were made last prove that the radio is off. */
