@@ -222,7 +222,7 @@ def test_an_interrupted_create_chooses_nothing(program, place):
     folder = place / "programs"
     folder.mkdir()
     (folder / "bwrap").write_text("#!/bin/sh\nread -r _ _ _ launcher _ </proc/$PPID/stat\n"
-                                  "kill -INT $launcher\nexec sleep 1000\n")
+                                  "kill -INT $launcher\nexec /bin/sleep 1000\n")
     (folder / "bwrap").chmod(0o755)
     launcher = Launcher(program, "", "root" if os.geteuid() == 0 else "self")
     launcher.environment["PATH"] = f"{folder}:{os.environ['PATH']}"
