@@ -8,8 +8,9 @@ readonly BUILD_PACKAGES=(g++ cmake ninja-build hidl-gen android-libbase-dev andr
     android-liblog-dev android-libutils-dev libtinyxml2-dev libgtest-dev libgmock-dev libbenchmark-dev)
 readonly PHONE_PACKAGES=(busybox python3 mksh bubblewrap proot)
 readonly PACKAGE_PACKAGES=(python3 groff-base dpkg-dev file)
-readonly TEST_PACKAGES=("${PACKAGE_PACKAGES[@]}" git make adb python3-pytest python3-lxml
-    python3-jsonschema python3-jinja2 python3-matplotlib chromium checkpolicy m4 valgrind)
+readonly TEST_PACKAGES=("${PACKAGE_PACKAGES[@]}" git make adb python3-pytest
+    python3-pytest-xdist python3-lxml python3-jsonschema python3-jinja2 python3-matplotlib chromium
+    checkpolicy m4 valgrind)
 readonly BENCH_PACKAGES=(python3 valgrind)
 readonly FORMAT_PACKAGES=(git clang-format blueprint-tools)
 readonly CHECK_PACKAGES=("${FORMAT_PACKAGES[@]}" clang clang-tidy shellcheck make python3

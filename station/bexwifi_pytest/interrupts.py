@@ -1,0 +1,71 @@
+# Copyright 2026 The BEX Wi-Fi Authors
+# SPDX-License-Identifier: Apache-2.0
+"""Ctrl-C, SIGTERM and SIGHUP end a run in good order: every radio off, and what has run in the report.
+
+The first signal interrupts the test that runs; its `with` blocks switch the radio off. Further ones do
+nothing, so that they do not interrupt that: Ctrl-C at a terminal reaches xdist's workers twice, from the
+terminal and from the controller.
+"""
+
+import contextlib
+import os
+import queue
+import signal
+import time
+
+import pytest
+
+# Seconds that xdist's workers get to switch their radios off; the kit gives up earlier.
+PATIENCE = 600
+
+
+class Interrupts:
+    """Handles the signals of this process until restore()."""
+
+    def __init__(self):
+        self.came = False
+        self.before = {}
+        for number in (signal.SIGINT, signal.SIGTERM, signal.SIGHUP):
+            if signal.getsignal(number) != signal.SIG_IGN:  # as under nohup
+                self.before[number] = signal.signal(number, self._interrupt)
+
+    def _interrupt(self, _number, _frame):
+        if not self.came:
+            self.came = True
+            raise KeyboardInterrupt
+
+    def restore(self):
+        for number, handler in self.before.items():
+            signal.signal(number, handler)
+
+
+class Workers:
+    """A plugin of xdist's controller: when the run ends early, it interrupts what the workers do, and
+    takes their reports until the last one has ended. By itself the controller would take no more
+    reports, and kill a worker that needs more than some seconds."""
+
+    def __init__(self, dsession):
+        self.dsession = dsession
+        self.running = set()
+
+    @pytest.hookimpl(optionalhook=True)
+    def pytest_testnodeready(self, node):
+        self.running.add(node)
+
+    @pytest.hookimpl(optionalhook=True)
+    def pytest_testnodedown(self, node):
+        self.running.discard(node)
+
+    @pytest.hookimpl(tryfirst=True)
+    def pytest_sessionfinish(self):
+        for node in self.running:
+            with contextlib.suppress(OSError):
+                os.kill(node.gateway._io.popen.pid, signal.SIGINT)  # execnet has no other way to tell
+        deadline = time.monotonic() + PATIENCE
+        while self.running and time.monotonic() < deadline:
+            with contextlib.suppress(queue.Empty):
+                name, event = self.dsession.queue.get(timeout=1)
+                if name == "testreport":
+                    self.dsession.worker_testreport(**event)
+                elif name in ("workerfinished", "errordown"):
+                    self.running.discard(event["node"])

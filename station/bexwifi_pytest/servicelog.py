@@ -1,0 +1,49 @@
+# Copyright 2026 The BEX Wi-Fi Authors
+# SPDX-License-Identifier: Apache-2.0
+"""The command lines that the service has run on a phone, from its log."""
+
+import re
+
+import bexwifi
+from bexwifi.adb import Adb
+
+# The tags of the two that run commands.
+RUNNERS = ("wifi@1.0-VendorTestSuit", "wifi@1.0-SnifferTool")
+# Seconds for reading the log.
+TIMEOUT = 30
+# Of a line in the form threadtime: date, time, (process, thread, priority, tag,) message.
+LINE = re.compile(r"(\d\d-\d\d \d\d:\d\d:\d\d\.\d+) +\d+ +\d+ [A-Z] \S+ *: (.*)")
+
+
+class ServiceLog:
+    """What the service logs from now on. The log may lose its oldest lines meanwhile."""
+
+    def __init__(self, serial):
+        self.adb = Adb(serial)
+        try:
+            self.before = self._read()
+        except bexwifi.BexWifiError:
+            self.before = []
+
+    def lines(self):
+        """Time and message of each line, or why there are none."""
+        try:
+            now = self._read()
+        except bexwifi.BexWifiError as error:
+            return [f"the log cannot be read: {error}"]
+        return [LINE.sub(r"\1 \2", line) for line in now[self._known(now):]]
+
+    def _known(self, now):
+        """How many lines of the log were there before."""
+        count = len(self.before)
+        if now[:count] == self.before:
+            return count
+        # It has lost lines at its beginning: what is left of `before` ends somewhere in it.
+        for length in range(min(count, len(now)), 0, -1):
+            if now[:length] == self.before[-length:]:
+                return length
+        return 0
+
+    def _read(self):
+        output = self.adb.shell("logcat", "-d", "-v", "threadtime", "-s", *RUNNERS, timeout=TIMEOUT)
+        return [line for line in output.stdout.splitlines() if not line.startswith("--------- ")]
