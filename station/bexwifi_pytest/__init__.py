@@ -22,6 +22,7 @@ everything in it. A file that cannot be written is told in one line, and pytest 
 """
 
 import pathlib
+import sys
 
 import pytest
 
@@ -30,7 +31,7 @@ import bexwifi
 from . import phones
 from .collector import Collector
 from .interrupts import Interrupts, Workers
-from .measurements import Measurement, MeasurementError
+from .measurements import Measurement, MeasurementError, printable
 from .servicelog import ServiceLog
 
 MEASUREMENTS = pytest.StashKey()
@@ -61,6 +62,9 @@ def is_worker(config):
 
 
 def pytest_configure(config):
+    for name, module in sys.modules.items():
+        if name.partition(".")[0] == "bexwifi":
+            module.__tracebackhide__ = True  # a failure shows the plan's line, and the kit's words
     if is_worker(config):
         config.option.loadgroup = True  # a worker has its options from the command line alone
 
@@ -124,7 +128,7 @@ def measure(request):
 def pytest_runtest_setup(item):
     serial = getattr(item, "callspec", None) and item.callspec.params.get("phone")
     if serial:
-        item.user_properties.append(("phone", serial))
+        item.user_properties.append(("phone", printable(serial)))
         item.stash[LOG] = ServiceLog(serial)
 
 

@@ -10,7 +10,7 @@ import pytest
 def identifier(serial):
     """A serial number as it appears in a test's name: printable, without the characters that mean
     something there."""
-    return urllib.parse.quote(serial, safe=":+=,")
+    return urllib.parse.quote(serial, safe=":+=,", errors="surrogateescape")
 
 
 def check(serials):

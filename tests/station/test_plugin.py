@@ -17,6 +17,7 @@ pytest_plugins = ["pytester"]
 # Has a log for each phone: "logs/R1".
 ADB = """#!/bin/sh
 case $4 in logcat*) exec cat "$LOGS/$2" ;; esac
+echo "error: device '$2' not found" >&2
 exit 1
 """
 LINE = "11-22 01:40:03.{:03}  7  8 D wifi@1.0-VendorTestSuit: cmd: \"{}\" successful execution\n"
@@ -156,6 +157,14 @@ def test_right(phone, measure):
     done.stdout.no_fnmatch_line("*Error*")
     assert outcomes(station) == [("R1", "plan.py::test_right", "passed", ""),
                                  ("R1", "plan.py::test_wrong", "failed", message)]
+
+
+def test_an_exception_of_the_kit_shows_the_plan_s_line_and_its_own(station):
+    done = station("def test_a(phone):\n    phone.doctor()", phones=["R1"])
+    message = "bexwifi.errors.UnknownPhone: phone R1: adb does not know it: see adb devices -l"
+    assert [line for line in done.outlines if line[:1] in ("E", ">")] == [
+        ">       phone.doctor()", f"E       {message}"]
+    assert outcomes(station) == [("R1", "plan.py::test_a", "failed", message)]
 
 
 def test_each_outcome(station):
