@@ -1,18 +1,8 @@
 // Copyright 2026 The BEX Wi-Fi Authors
 // SPDX-License-Identifier: Apache-2.0
 
-#include <gmock/gmock.h>
-#include <gtest/gtest.h>
-#include <unistd.h>
+#include "ClientTest.h"
 
-#include <algorithm>
-#include <regex>
-#include <sstream>
-#include <thread>
-
-#include "FakeService.h"
-#include "Gate.h"
-#include "client/Client.h"
 #include "client/Help.h"
 
 namespace vendor::korvan::bex::wifi::client {
@@ -23,51 +13,6 @@ using ::testing::AllOf;
 using ::testing::ElementsAre;
 using ::testing::HasSubstr;
 using ::testing::Not;
-using ::testing::StartsWith;
-using namespace std::chrono_literals;
-using Words = std::vector<std::string>;
-
-// One line that names the program and holds the text.
-MATCHER_P(IsOneLineWith, text, "") {
-    return std::count(arg.begin(), arg.end(), '\n') == 1 && arg.back() == '\n' &&
-           arg.rfind("bex-wifi-client: ", 0) == 0 && arg.find(text) != arg.npos;
-}
-
-// What tells of the call's course differs from run to run.
-std::string withoutCourse(const std::string& json) {
-    return std::regex_replace(json,
-                              std::regex(R"("radio_may_be_on":(true|false|null),"stage":"[a-z]+",)"
-                                         R"("started_at":"[0-9-]+T[0-9:]+\.[0-9]{3}Z",)"
-                                         R"("duration_ms":[0-9]+\.[0-9]{3},)"
-                                         R"("client_version":"[0-9.]+",)"),
-                              "COURSE,");
-}
-
-class ClientTest : public ::testing::Test {
-  protected:
-    int run(const Words& arguments) {
-        return runClient(arguments, {mOut, mErr, mTryFind, mAwaitFind, mColumns, mSecond});
-    }
-
-    std::string out() const { return mOut.str(); }
-    std::string err() const { return mErr.str(); }
-
-    sp<FakeService> mService = new FakeService;
-    int mTried = 0;
-    int mAwaited = 0;
-    FindService mTryFind = [this] {
-        ++mTried;
-        return mService;
-    };
-    FindService mAwaitFind = [this] {
-        ++mAwaited;
-        return mService;
-    };
-    std::function<size_t()> mColumns;
-    std::chrono::nanoseconds mSecond = 1s;
-    std::ostringstream mOut;
-    std::ostringstream mErr;
-};
 
 TEST_F(ClientTest, PrintsTheNumberAndNothingElse) {
     EXPECT_EQ(run({"RunTxStop", "6"}), 0);
@@ -237,13 +182,6 @@ TEST_F(ClientTest, ExitCode4WhenTheServiceHasTooManyClients) {
     }
 }
 
-class ClientDeadlineTest : public ClientTest {
-  protected:
-    void wait() { mGate.wait(); }
-
-    Gate mGate;
-};
-
 TEST_F(ClientDeadlineTest, ExitCode5InTheSearch) {
     mAwaitFind = [this]() -> sp<IWifiService> {
         wait();
@@ -265,110 +203,6 @@ TEST_F(ClientDeadlineTest, ExitCode5InTheCall) {
               "be running\n");
 }
 
-TEST_F(ClientDeadlineTest, JsonAfterTheDeadline) {
-    mService->onCall = [this] { wait(); };
-    EXPECT_EQ(run({"--timeout", "2", "--json", "RunRxStop", "6"}), 5);
-    EXPECT_EQ(withoutCourse(out()),
-              R"({"schema_version":1,"method":"RunRxStop","arguments":{"channel":"6"},)"
-              R"("ok":false,"value":null,"count":null,COURSE,"exit_code":5,"error":)"
-              R"("the deadline passed in RunRxStop: the service's commands may still be running"})"
-              "\n");
-    EXPECT_THAT(err(), IsOneLineWith("the deadline passed in RunRxStop"));
-}
-
-TEST_F(ClientTest, JsonOfSuccess) {
-    EXPECT_EQ(run({"RunTxStop", "6", "--json"}), 0);
-    EXPECT_EQ(withoutCourse(out()),
-              R"({"schema_version":1,"method":"RunTxStop","arguments":{"channel":"6"},)"
-              R"("ok":true,"value":0,COURSE,"exit_code":0})"
-              "\n");
-    EXPECT_EQ(err(), "");
-}
-
-TEST_F(ClientTest, JsonNamesEveryArgumentAndWritesFlagsAsFlags) {
-    mService->text = "ok";
-    EXPECT_EQ(run({"--json", "RunRxNStart", "6", "20", "7", "1", "a\"\n\xFF"}), 0);
-    EXPECT_EQ(withoutCourse(out()),
-              R"({"schema_version":1,"method":"RunRxNStart","arguments":{"channel":"6",)"
-              R"("bandwidth":"20","rate":"7","vht":true,"antenna":"a\"\n)"
-              "\uFFFD"
-              R"("},"ok":true,"arguments_hex":{"antenna":"61220aff"},)"
-              R"("value":"ok","count":null,COURSE,"exit_code":0})"
-              "\n");
-}
-
-TEST_F(ClientTest, JsonWithoutArgumentsAndWithAFlag) {
-    mService->flag = true;
-    EXPECT_EQ(run({"--json", "isMimoSupport"}), 0);
-    EXPECT_EQ(withoutCourse(out()),
-              R"({"schema_version":1,"method":"isMimoSupport","arguments":{},"ok":true,)"
-              R"("value":true,COURSE,"exit_code":0})"
-              "\n");
-}
-
-TEST_F(ClientTest, JsonOfAFailureKeepsTheValue) {
-    mService->number = -1;
-    EXPECT_EQ(run({"--json", "snifferStop"}), 1);
-    EXPECT_EQ(withoutCourse(out()),
-              R"({"schema_version":1,"method":"snifferStop","arguments":{},"ok":false,"value":-1,)"
-              R"(COURSE,"exit_code":1,"error":"snifferStop answered -1: which command )"
-              "failed is in the service's log, tags that begin with \\\"wifi@1.0-\\\": "
-              "logcat (a simulated phone: ./dev log)\"}\n");
-    EXPECT_THAT(err(), IsOneLineWith("snifferStop answered -1"));
-}
-
-TEST_F(ClientTest, JsonWithoutAService) {
-    mService = nullptr;
-    EXPECT_EQ(run({"--json", "snifferStop"}), 3);
-    EXPECT_THAT(withoutCourse(out()),
-                StartsWith(
-                        R"({"schema_version":1,"method":"snifferStop","arguments":{},"ok":false,)"
-                        R"("value":null,COURSE,"exit_code":3,"error":")"
-                        "vendor.korvan.bex.wifi@1.0::IWifiService/default is not registered"));
-    EXPECT_THAT(out(), ::testing::EndsWith("find it?\"}\n"));
-    EXPECT_THAT(err(), IsOneLineWith("is not registered"));
-}
-
-TEST_F(ClientTest, JsonOfAFailedTransport) {
-    mService->broken = ::android::DEAD_OBJECT;
-    EXPECT_EQ(run({"--json", "RunRxStop", "6"}), 4);
-    EXPECT_THAT(withoutCourse(out()),
-                AllOf(StartsWith(
-                              R"({"schema_version":1,"method":"RunRxStop",)"
-                              R"("arguments":{"channel":"6"},"ok":false,"value":null,)"
-                              R"("count":null,COURSE,"exit_code":4,"error":"RunRxStop failed in )"),
-                      ::testing::EndsWith("\\\"\"}\n")));
-    EXPECT_THAT(err(), IsOneLineWith("RunRxStop failed in the transport"));
-}
-
-TEST_F(ClientTest, JsonOfATextThatIsNotUtf8AddsItsBytes) {
-    mService->text = "a\xFF\x01";
-    EXPECT_EQ(run({"--json", "RunRxStop", "6"}), 0);
-    EXPECT_EQ(withoutCourse(out()),
-              R"({"schema_version":1,"method":"RunRxStop","arguments":{"channel":"6"},"ok":true,)"
-              "\"value\":\"a\uFFFD\\u0001\",\"value_hex\":\"61ff01\",\"count\":null,"
-              R"(COURSE,"exit_code":0})"
-              "\n");
-}
-
-TEST_F(ClientTest, JsonHoldsTheCountAsANumber) {
-    for (const auto& [text, count] :
-         std::vector<std::pair<std::string, std::string>>{{"48", "48"},
-                                                          {"Rx: 041", "41"},
-                                                          {"Rx: 0\n", "0"},
-                                                          {"ok", "null"},
-                                                          {"Rx: ", "null"},
-                                                          {"Rx: goodPackets", "null"},
-                                                          {"", "null"},
-                                                          {" ", "null"},
-                                                          {"-1", "null"}}) {
-        mOut.str("");
-        mService->text = text;
-        EXPECT_EQ(run({"RunRxStop", "6", "--json"}), 0);
-        EXPECT_THAT(out(), HasSubstr("\"count\":" + count + ",")) << text;
-    }
-}
-
 TEST_F(ClientTest, ARequiredCountThatIsMissingIsAFailureOfItsOwn) {
     mService->text = "Rx: ";
     EXPECT_EQ(run({"RunRxStop", "6", "--require-count"}), 7);
@@ -381,29 +215,6 @@ TEST_F(ClientTest, ARequiredCountThatIsMissingIsAFailureOfItsOwn) {
     EXPECT_EQ(run({"RunTxStop", "6", "--require-count"}), 2);
 }
 
-TEST_F(ClientTest, JsonTellsHowFarTheCallCameAndWhatMayBeOn) {
-    const auto members = [this](const Words& call) {
-        mOut.str("");
-        run(call);
-        std::smatch found;
-        const std::string json = out();
-        std::regex_search(json, found, std::regex("\"radio_may_be_on\":.*?,\"started_at"));
-        return found.str();
-    };
-    EXPECT_THAT(members({"--json", "RunTxStStart", "6", "20", "1"}),
-                StartsWith(R"("radio_may_be_on":true,"stage":"done",)"));
-    EXPECT_THAT(members({"--json", "RunTxStop", "6"}),
-                StartsWith(R"("radio_may_be_on":null,"stage":"done",)"));
-    mService->broken = true;
-    EXPECT_THAT(members({"--json", "RunTxStStart", "6", "20", "1"}),
-                StartsWith(R"("radio_may_be_on":true,"stage":"call",)"));
-    mService = nullptr;
-    EXPECT_THAT(members({"--json", "RunTxStStart", "6", "20", "1"}),
-                StartsWith(R"("radio_may_be_on":null,"stage":"lookup",)"));
-    EXPECT_THAT(members({"--json", "stop"}),
-                StartsWith(R"("radio_may_be_on":true,"stage":"lookup",)"));
-}
-
 TEST_F(ClientTest, AValueThatNoChipKnowsIsAWarningAndTheCallIsMade) {
     const Words call = {"RunRxBgStart", "999", "13", ""};
     mService->text = "ok";
@@ -413,14 +224,6 @@ TEST_F(ClientTest, AValueThatNoChipKnowsIsAWarningAndTheCallIsMade) {
                                      "1 to 14 (2.4 GHz), 36 and up (5 GHz)); "));
     EXPECT_THAT(err(), AllOf(HasSubstr("; rate \"13\" is none"), HasSubstr("; antenna is empty")));
     EXPECT_THAT(mService->calls, ElementsAre(call));
-}
-
-TEST_F(ClientTest, JsonHoldsTheWarnings) {
-    EXPECT_EQ(run({"RunTxStop", "", "--json"}), 0);
-    EXPECT_THAT(out(), HasSubstr(R"("warnings":["channel is empty: )"));
-    EXPECT_EQ(err(), "");
-    EXPECT_EQ(run({"RunTxStop", "165", "--json"}), 0);
-    EXPECT_THAT(out(), ::testing::EndsWith("}\n"));
 }
 
 TEST_F(ClientTest, StrictRefusesWhatNoChipKnows) {
@@ -453,14 +256,6 @@ TEST_F(ClientTest, AMessageQuotesOnlyTheBeginOfALongText) {
                 IsOneLineWith("answered no count: \"" + tooLong.substr(0, 40) + "\"... ("));
 }
 
-TEST_F(ClientTest, JsonOfALargeTextIsOneLine) {
-    mService->text = std::string(300'000, '\n');
-    EXPECT_EQ(run({"--json", "RunRxStop", "6"}), 0);
-    const std::string json = out();
-    EXPECT_EQ(std::count(json.begin(), json.end(), '\n'), 1);
-    EXPECT_EQ(std::count(json.begin(), json.end(), '\\'), 300'000);
-}
-
 TEST_F(ClientTest, ListsAndExplainsWithoutTheService) {
     const std::pair<Words, std::string> cases[] = {
             {{"list"}, listText()},
@@ -483,90 +278,6 @@ TEST_F(ClientTest, ListsAndExplainsWithoutTheService) {
     }
     EXPECT_EQ(err(), "");
     EXPECT_EQ(mTried + mAwaited, 0);
-}
-
-// A stream whose device is full.
-class FullBuffer : public std::streambuf {
-    int overflow(int) override {
-        errno = ENOSPC;
-        return traits_type::eof();
-    }
-};
-
-TEST_F(ClientTest, ExitCode6WhenTheResultCannotBeWritten) {
-    mService->number = -1;
-    for (const Words& arguments : {Words{"RunTxStop", "6"}, Words{"RunTxStop", "6", "--json"},
-                                   Words{"list"}, Words{"--help"}}) {
-        mErr.str("");
-        FullBuffer full;
-        std::ostream out(&full);
-        EXPECT_EQ(runClient(arguments, {out, mErr, mTryFind, mAwaitFind}), 6);
-        EXPECT_EQ(err(),
-                  "bex-wifi-client: cannot write the result to stdout: No space left on device\n");
-    }
-}
-
-// Opens a gate as soon as a text has been written and flushed.
-class WatchedBuffer : public std::stringbuf {
-  public:
-    WatchedBuffer(std::string text, Gate* gate) : mText(std::move(text)), mGate(gate) {}
-
-  private:
-    int sync() override {
-        if (mGate != nullptr && str().find(mText) != std::string::npos) {
-            mGate->open();
-            mGate = nullptr;
-        }
-        return 0;
-    }
-
-    const std::string mText;
-    Gate* mGate;
-};
-
-TEST_F(ClientTest, ATerminalShowsTheSecondsInPlaceAndErasesThemBeforeTheResult) {
-    Gate gate;
-    mService->onCall = [&gate] { gate.wait(); };
-    WatchedBuffer buffer(": 3 s", &gate);
-    std::ostream screen(&buffer); // Both streams, as a terminal shows them.
-    EXPECT_EQ(runClient({"RunTxStop", "6"},
-                        {screen, screen, mTryFind, mAwaitFind, [] { return 80; }, 50ms}),
-              0);
-    EXPECT_THAT(buffer.str(), ::testing::MatchesRegex("\rRunTxStop: 1 s\rRunTxStop: 2 s"
-                                                      "\rRunTxStop: 3 s(\rRunTxStop: [0-9]+ s)*"
-                                                      "\r {14,}\r0\n"));
-}
-
-// The last column stays free, since some terminals begin a new line once it is filled.
-TEST_F(ClientTest, ANarrowTerminalShowsWhatFitsWhateverItsWidthBecomes) {
-    Gate gate;
-    mService->onCall = [&gate] { gate.wait(); };
-    std::ostringstream screen;
-    size_t ticks = 0;
-    const auto columns = [&ticks, &gate]() -> size_t {
-        constexpr size_t kWidths[] = {14, 13, 5, 1};
-        if (ticks == 4) gate.open();
-        return kWidths[std::min<size_t>(ticks++, 3)];
-    };
-    EXPECT_EQ(runClient({"RunTxStop", "6"}, {screen, screen, mTryFind, mAwaitFind, columns, 50ms}),
-              0);
-    EXPECT_THAT(screen.str(), ::testing::MatchesRegex("\rRunTxStop: 1 \rRunTxStop: 2\rRunT\r+"
-                                                      "0\n"));
-}
-
-TEST_F(ClientTest, ATerminalShowsNothingOfAShortCall) {
-    mColumns = [] { return 80; };
-    mSecond = 1h;
-    EXPECT_EQ(run({"RunTxStop", "6"}), 0);
-    EXPECT_EQ(err(), "");
-}
-
-TEST_F(ClientTest, WithoutATerminalASlowCallShowsNothing) {
-    mSecond = 1ms;
-    mService->onCall = [] { std::this_thread::sleep_for(50ms); }; // Fifty of these seconds.
-    EXPECT_EQ(run({"RunTxStop", "6"}), 0);
-    EXPECT_EQ(out(), "0\n");
-    EXPECT_EQ(err(), "");
 }
 
 } // namespace
