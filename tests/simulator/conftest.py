@@ -11,7 +11,7 @@ import tempfile
 
 import pytest
 
-from support.waiting import wait_for as wait_until
+from support.waiting import wait_for
 
 SOURCE = pathlib.Path(__file__).resolve().parents[2]
 SERVICE = "/vendor/bin/hw/vendor.korvan.bex.wifi@1.0-service"

@@ -8,7 +8,8 @@ import subprocess
 
 import pytest
 
-from conftest import Launcher, wait_until
+from conftest import Launcher
+from support.waiting import wait_for
 from launcher import faults
 
 TOOLS = ("busybox", "cat", "getprop", "ifconfig", "iw", "setprop", "sleep", "wl")
@@ -104,7 +105,7 @@ def test_a_waiting_tool_goes_on_when_released(phone):
     phone.fault("wl", "wait")
     waiting = phone.root / "phone/faults/wl.waiting"
     call = phone.start("wl mpc", stdout=subprocess.PIPE)
-    wait_until(lambda: waiting.exists() and waiting.read_text().count("\n") == 1)
+    wait_for(lambda: waiting.exists() and waiting.read_text().count("\n") == 1)
     assert call.poll() is None
     phone.fault("wl", "release")
     assert call.communicate(timeout=60)[0] == b"1\n"
@@ -113,7 +114,7 @@ def test_a_waiting_tool_goes_on_when_released(phone):
 def test_clear_lets_waiting_tools_go_on(phone):
     phone.fault("sleep", "wait", "exit", 6)
     call = phone.start("sleep 1000; exit $?")
-    wait_until((phone.root / "phone/faults/sleep.waiting").exists)
+    wait_for((phone.root / "phone/faults/sleep.waiting").exists)
     phone.fault("sleep", "clear")
     assert call.wait(60) == 6
 

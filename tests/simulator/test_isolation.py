@@ -15,7 +15,8 @@ import subprocess
 
 import pytest
 
-from conftest import ENDLESS, SOURCE, Launcher, Phone, wait_until
+from conftest import ENDLESS, SOURCE, Launcher, Phone
+from support.waiting import wait_for
 
 # The version of Landlock that the kernel has.
 LANDLOCK = ctypes.CDLL(None).syscall(444, None, 0, 1)
@@ -136,7 +137,7 @@ def test_the_machine_s_devices_stay(any_phone):
 
 def test_nothing_inside_holds_a_capability(any_new_phone):
     any_new_phone.start(f"exec sleep {ENDLESS}")
-    wait_until(any_new_phone.sleepers)
+    wait_for(any_new_phone.sleepers)
     for number in any_new_phone.sleepers():
         lines = pathlib.Path(f"/proc/{number}/status").read_text().splitlines()
         status = dict(line.split(":\t", 1) for line in lines if ":\t" in line)

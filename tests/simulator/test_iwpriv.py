@@ -6,8 +6,8 @@ import re
 
 import pytest
 
-from conftest import wait_until
 from qualcomm import CON_MODE, copies, refusals, test_mode as enter
+from support.waiting import wait_for
 
 RATES = ["11B_LONG_1_MBPS", "11B_LONG_5_5_MBPS", "11A_54_MBPS", "MCS_6_5_MBPS", "MCS_72_2_MBPS",
          "MCS_CB_135_MBPS", "MCS_VHT20_NGI_78_MBPS", "MCS_VHT40_NGI_CB_180_MBPS",
@@ -120,14 +120,14 @@ def test_one_test_at_a_time(tester, running):
 def test_packets_are_counted_only_while_receiving(tester):
     assert count(tester) == 0
     tester.output(script("rx 1"))
-    wait_until(lambda: count(tester) > 0)
+    wait_for(lambda: count(tester) > 0)
     first = count(tester)
-    wait_until(lambda: count(tester) > first)
+    wait_for(lambda: count(tester) > first)
     tester.output(script("rx 0"))
     stopped = count(tester)
     assert stopped > first and count(tester) == stopped
     tester.output(script("rx 1"))
-    wait_until(lambda: count(tester) > stopped)
+    wait_for(lambda: count(tester) > stopped)
     tester.output(script("rx 0", "clr_rxpktcnt 1"))
     assert count(tester) == 0
 

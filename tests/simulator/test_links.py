@@ -7,7 +7,7 @@ import socket
 
 import pytest
 
-from conftest import wait_until
+from support.waiting import wait_for
 
 MARK = ". /phone/lib/tool\n"
 
@@ -64,7 +64,7 @@ def test_a_link_in_place_of_a_fault_is_replaced(phone, victim, name):
     phone.output(f"ln -s {victim}/file /phone/faults/{name}")
     assert not refused(phone, "fault", "wl", "print", victim / "file", "wait", "exit", 5)
     call = phone.start("wl up")
-    wait_until((phone.root / "phone/faults/wl.waiting").exists)
+    wait_for((phone.root / "phone/faults/wl.waiting").exists)
     phone.fault("wl", "release")
     assert call.wait(60) == 5
     phone.output(f"ln -sf {victim}/file /phone/faults/{name}")

@@ -6,8 +6,8 @@ import re
 
 import pytest
 
-from conftest import wait_until
 from qualcomm import CON_MODE, copies, refusals, test_mode as enter
+from support.waiting import wait_for
 
 FRAMES = "-X 00:03:7F:44:55:11 -Y 00:03:7F:44:55:22 -N 00:03:7F:44:55:33"
 PLAIN, NEWER = ("qca", "wcn39xx"), ("qca639x", "wcn685x", "wcn6750")
@@ -179,7 +179,7 @@ def test_a_reception_ends_with_its_statistics(phone_of, chip):
     for option in ("-x 0", "-t 0"):
         phone.output(line_for(chip, "rx"))
         since = float(phone.driver()["engine_since"])
-        wait_until(lambda: float(phone.output("echo $EPOCHREALTIME")) > since + 0.002)
+        wait_for(lambda: float(phone.output("echo $EPOCHREALTIME")) > since + 0.002)
         printed = phone.output(stop_for(chip, option))
         assert printed.count("goodPackets") == 1 and printed.count("\n") > 2
         assert int(re.search(form, printed, re.MULTILINE).group(1)) > 0

@@ -8,7 +8,8 @@ import signal
 
 import pytest
 
-from conftest import ENDLESS, SERVICE, Launcher, Phone, wait_until
+from conftest import ENDLESS, SERVICE, Launcher, Phone
+from support.waiting import wait_for
 
 ASK = "/data/ask"
 
@@ -36,7 +37,7 @@ def test_down_leaves_no_process_and_no_file(any_phone):
     assert inside
     assert any_phone.borrowed_folder().exists() == (any_phone.launcher.kind == "proot")
     sleeping = any_phone.start(f"{ASK} 'sleep {ENDLESS}'")
-    wait_until(any_phone.sleepers)
+    wait_for(any_phone.sleepers)
     any_phone.do("down")
     assert sleeping.wait(60) == 0  # its service has gone
     assert any_phone.processes() == []
@@ -93,11 +94,11 @@ def test_a_service_that_ends_is_reported(any_launcher, place, script, outcome):
 def test_killing_the_keeper_ends_the_phone(any_phone):
     any_phone.do("up")
     os.kill(int((any_phone.folder / "pid").read_text()), signal.SIGKILL)
-    wait_until(lambda: any_phone.processes() == [])
+    wait_for(lambda: any_phone.processes() == [])
     any_phone.do("up")
     assert ask(any_phone, "echo again") == "same again\n"
     os.kill(int((any_phone.folder / "pid").read_text()), signal.SIGKILL)
-    wait_until(lambda: any_phone.processes() == [])
+    wait_for(lambda: any_phone.processes() == [])
     any_phone.launcher("down", any_phone.folder)
     assert not any_phone.borrowed_folder().exists()
 
@@ -108,13 +109,13 @@ def test_killing_the_keeper_ends_the_phone(any_phone):
 def test_killing_a_run_takes_everything_inside_with_it(any_new_phone, victim, number):
     call = any_new_phone.start(f"busybox setsid sleep {ENDLESS} & sleep {ENDLESS} & "
                                f"exec sleep {ENDLESS}")
-    wait_until(lambda: len(any_new_phone.sleepers()) == 3)
+    wait_for(lambda: len(any_new_phone.sleepers()) == 3)
     pid = call.pid
     for _ in range(("launcher", "holder", "sandbox").index(victim)):
         pid = int(pathlib.Path(f"/proc/{pid}/task/{pid}/children").read_text().split()[0])
     os.kill(pid, number)
     call.wait(60)
-    wait_until(lambda: any_new_phone.processes() == [])
+    wait_for(lambda: any_new_phone.processes() == [])
     if victim == "sandbox":
         assert not list(pathlib.Path("/tmp").glob(f"prooted-{pid}-*"))
 

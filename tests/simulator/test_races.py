@@ -11,7 +11,8 @@ import subprocess
 
 import pytest
 
-from conftest import SERVICE, Launcher, Phone, wait_until
+from conftest import SERVICE, Launcher, Phone
+from support.waiting import wait_for
 
 
 def answers(phone):
@@ -56,7 +57,7 @@ def looked_at_fixture(off):
 def test_up_waits_for_a_program_that_looks_at_the_lock(looked_at):
     phone, lock = looked_at
     call = start(phone, "up")
-    wait_until(lambda: has_open(call.pid, phone.folder / "pid"))
+    wait_for(lambda: has_open(call.pid, phone.folder / "pid"))
     fcntl.flock(lock, fcntl.LOCK_UN)
     assert finish(call) == (0, "")
     assert answers(phone)
@@ -70,7 +71,7 @@ def test_down_kills_nobody_by_a_stale_number(looked_at):
             lock.write(f"{stranger.pid}\n".encode())
             lock.flush()
             call = start(phone, "down")
-            wait_until(lambda: has_open(call.pid, phone.folder / "pid"))
+            wait_for(lambda: has_open(call.pid, phone.folder / "pid"))
             fcntl.flock(lock, fcntl.LOCK_UN)
             assert finish(call) == (0, f"phone: {phone.folder} is not up\n")
             assert stranger.poll() is None
@@ -103,7 +104,7 @@ def start_up_that_waits(launcher, place):
     phone = Phone.create(launcher, place / "phone", "--install", f"{service}={SERVICE}")
     phone.output("mkfifo /phone/endless")
     waiting = start(phone, "up")
-    wait_until(lambda: (phone.folder / "pid").exists() and (phone.folder / "pid").read_text())
+    wait_for(lambda: (phone.folder / "pid").exists() and (phone.folder / "pid").read_text())
     return phone, waiting
 
 

@@ -15,7 +15,8 @@ import termios
 
 import pytest
 
-from conftest import ENDLESS, wait_until
+from conftest import ENDLESS
+from support.waiting import wait_for
 
 WORDS = "the caller lives"
 
@@ -40,7 +41,7 @@ def test_a_service_that_kills_its_group_leaves_the_keeper_to_clean_up(any_phone)
     any_phone.do("up")
     keeper = int((any_phone.folder / "pid").read_text())
     any_phone.run("/data/ask", "kill -9 0")
-    wait_until(lambda: not pathlib.Path(f"/proc/{keeper}").exists())
+    wait_for(lambda: not pathlib.Path(f"/proc/{keeper}").exists())
     assert any_phone.processes() == []
     assert not any_phone.borrowed_folder().exists()  # a killed keeper would have left it
     any_phone.do("up")
@@ -100,7 +101,7 @@ def stat(process):
 
 def test_what_runs_inside_has_no_terminal_to_type_into(any_new_phone):
     with at_terminal(any_new_phone, f"exec sleep {ENDLESS}") as (launcher, _):
-        wait_until(any_new_phone.sleepers)
+        wait_for(any_new_phone.sleepers)
         for process in any_new_phone.sleepers():
             _, _, group, session, terminal = stat(process)
             assert terminal == "0"
@@ -124,7 +125,7 @@ def test_a_key_reaches_the_command(any_new_phone, name, key):
     line = f"trap 'echo caught; exit 7' {name}; echo ready; busybox sleep {ENDLESS}"
     with at_terminal(any_new_phone, line) as (launcher, terminal):
         await_word(terminal, "ready")
-        wait_until(any_new_phone.sleepers)
+        wait_for(any_new_phone.sleepers)
         os.write(terminal, key)
         await_word(terminal, "caught")
         assert launcher.wait(60) == 7
@@ -142,12 +143,12 @@ def test_a_command_that_ignores_the_key_goes_on(any_new_phone):
 
 def test_a_command_stops_and_goes_on_with_its_launcher(any_new_phone):
     with at_terminal(any_new_phone, f"sleep {ENDLESS}; echo over") as (launcher, terminal):
-        wait_until(any_new_phone.sleepers)
+        wait_for(any_new_phone.sleepers)
         sleeper = any_new_phone.sleepers()[0]
         os.write(terminal, b"\x1a")
-        wait_until(lambda: stat(launcher.pid)[0] == "T" and stat(sleeper)[0] in "Tt")
+        wait_for(lambda: stat(launcher.pid)[0] == "T" and stat(sleeper)[0] in "Tt")
         os.kill(launcher.pid, signal.SIGCONT)
-        wait_until(lambda: stat(launcher.pid)[0] == "S" and stat(sleeper)[0] == "S")
+        wait_for(lambda: stat(launcher.pid)[0] == "S" and stat(sleeper)[0] == "S")
         os.kill(sleeper, signal.SIGKILL)
         await_word(terminal, "over")
         assert launcher.wait(60) == 0
@@ -156,7 +157,7 @@ def test_a_command_stops_and_goes_on_with_its_launcher(any_new_phone):
 @pytest.mark.parametrize("number", [signal.SIGHUP, signal.SIGTERM])
 def test_ending_the_launcher_ends_what_will_not_end(any_new_phone, number):
     call = any_new_phone.start(f"trap '' TERM HUP INT; sleep {ENDLESS}; exec sleep {ENDLESS}")
-    wait_until(any_new_phone.sleepers)
+    wait_for(any_new_phone.sleepers)
     call.send_signal(number)
     assert call.wait(60) == 128 + number
     assert any_new_phone.processes() == []

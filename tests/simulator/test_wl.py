@@ -6,7 +6,8 @@ import subprocess
 
 import pytest
 
-from conftest import ENDLESS, wait_until
+from conftest import ENDLESS
+from support.waiting import wait_for
 
 FIRMWARE = "/sys/module/bcmdhd/parameters/firmware_path"
 MAC = "00:11:22:33:44:55"
@@ -171,15 +172,15 @@ def test_counters_are_a_long_listing_of_names_and_numbers(tester):
 def test_packets_are_counted_only_while_receiving(tester):
     assert tester.output(COUNT) == "0"
     tester.output(f"wl pkteng_start {MAC} rx")
-    wait_until(lambda: int(tester.output(COUNT)) > 0)
+    wait_for(lambda: int(tester.output(COUNT)) > 0)
     first = int(tester.output(COUNT))
-    wait_until(lambda: int(tester.output(COUNT)) > first)
+    wait_for(lambda: int(tester.output(COUNT)) > first)
     tester.output("wl pkteng_stop rx")
     stopped = tester.output(COUNT)
     assert int(stopped) > first
     assert tester.output(COUNT) == stopped
     tester.output(f"wl pkteng_start {MAC} rx")
-    wait_until(lambda: int(tester.output(COUNT)) > int(stopped))
+    wait_for(lambda: int(tester.output(COUNT)) > int(stopped))
     tester.output(TEST_MODE)
     assert tester.output(COUNT) == "0"
 
