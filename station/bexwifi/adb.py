@@ -13,7 +13,9 @@ from bexwifi.errors import AdbFailed, NoAnswer, Offline, Unauthorised, UnknownPh
 # What adb needs in addition to the command's own deadline, and what it may take for anything else, in
 # seconds.
 ADB_TIMEOUT = 15
-# How often adb is asked to reach a phone that it does not know, and the seconds in between.
+# The seconds in which a new server finds the phones on USB.
+USB_TIMEOUT = 5
+# How often adb is asked to find a phone that it has lost, and the seconds in between.
 CONNECTIONS = 3
 PAUSE = 0.5
 
@@ -52,13 +54,14 @@ class Adb:
         timeout: seconds that the command takes at most; adb gets some more
         Raises AdbFailed when nothing was run, and NoAnswer when that is not known.
         """
-        line = " ".join(map(shlex.quote, words))
-        output = self.run("shell", line, timeout=timeout + ADB_TIMEOUT)
+        arguments = ("shell", " ".join(map(shlex.quote, words)))
+        output = self.run(*arguments, timeout=timeout + ADB_TIMEOUT)
+        failure = self._failure(output)
         for _ in range(CONNECTIONS):
-            failure = self._failure(output)
-            if not isinstance(failure, (UnknownPhone, Offline)) or not self._connect(output):
+            if not isinstance(failure, (UnknownPhone, Offline)) or not self._finds_again(output):
                 break
-            output = self.run("shell", line, timeout=timeout + ADB_TIMEOUT)
+            output = self.run(*arguments, timeout=timeout + ADB_TIMEOUT)
+            failure = self._failure(output)
         if failure is not None:
             raise failure
         return output
@@ -73,7 +76,7 @@ class Adb:
         return self._run("-s", self.serial, *arguments, timeout=timeout)
 
     @signals.holds
-    def _run(self, *arguments, timeout):
+    def _run(self, *arguments, timeout=ADB_TIMEOUT):
         try:
             # pylint: disable-next=consider-using-with
             process = subprocess.Popen(
@@ -109,16 +112,18 @@ class Adb:
                     return AdbFailed(self.serial, f"adb's server does not start: {line}")
         return None
 
-    def _connect(self, output):
-        """Whether there is a chance that adb finds the phone now. A server that was started again has
-        forgotten the phones that it was connected with, and needs a moment for those on USB."""
-        if ":" in self.serial:
-            self._run("disconnect", self.serial, timeout=ADB_TIMEOUT)
-            connected = self._run("connect", self.serial, timeout=ADB_TIMEOUT).stdout
-            if not connected.startswith("connected"):
-                time.sleep(PAUSE)
-            return True
-        if "daemon started" in output.stderr:
-            time.sleep(PAUSE)
-            return True
+    def _finds_again(self, output):
+        """Whether adb may find the phone now. A server that was started again has forgotten the phones on
+        the network, and needs a moment for those on USB."""
+        try:
+            if ":" in self.serial:
+                self._run("disconnect", self.serial)
+                if not self._run("connect", self.serial).stdout.startswith("connected"):
+                    time.sleep(PAUSE)
+                return True
+            if "daemon started" in output.stderr:
+                self.run("wait-for-device", timeout=USB_TIMEOUT)
+                return True
+        except NoAnswer:
+            pass
         return False

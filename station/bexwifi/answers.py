@@ -35,6 +35,7 @@ class Course:
 
     exit_code: the client's; 0 is success
     error: why it is not 0, in the client's words; None when it is
+    stage: "lookup": nothing was called; "call": called, not answered; "done": answered
     radio_may_be_on: True after a start that was called; None where the call does not show it
     started_at: when the search for the service began, UTC by the phone's clock
     duration: seconds on the phone, without the time that adb takes
@@ -44,6 +45,7 @@ class Course:
     arguments: Dict[str, Union[str, bool]]
     exit_code: int
     error: Optional[str]
+    stage: str
     radio_may_be_on: Optional[bool]
     started_at: datetime.datetime
     duration: float

@@ -11,6 +11,7 @@ class BexWifiError(Exception):
     words: the text without the serial number
     answer: what the client answered nevertheless (Answer, StopAnswer), or None
     radio_may_be_on: after a start, whether it may have started something
+    may_go_on: whether the service's commands may still run
     """
 
     # Whether the call may have begun on the phone, where no answer says it.
@@ -28,6 +29,10 @@ class BexWifiError(Exception):
     @property
     def radio_may_be_on(self):
         return self._may_have_begun if self.answer is None else bool(self.answer.radio_may_be_on)
+
+    @property
+    def may_go_on(self):
+        return self._may_have_begun if self.answer is None else self.answer.stage == "call"
 
 
 class CommandFailed(BexWifiError):

@@ -89,8 +89,8 @@ class PhoneLock:
 
     @property
     def started(self):
-        """The method that may have switched the radio on; empty when it is off, as far as anybody here
-        knows. Only for who holds the lock."""
+        """The method that may have switched the radio on, or may still run; empty when there is none, as
+        far as anybody here knows. Only for who holds the lock."""
         return self._started or os.pread(self._descriptor, 100, 0).decode(errors="replace")
 
     @started.setter

@@ -26,10 +26,17 @@ class Phone:
         if not timeout > 0:
             raise ValueError(f"a timeout is a number of seconds above 0, not {timeout!r}")
         self.serial = serial
-        self.timeout = timeout
         self.lock = PhoneLock.of(serial)
         self.client = Client(serial, timeout)
         self._methods = None
+
+    @property
+    def timeout(self):
+        return self.client.timeout
+
+    @timeout.setter
+    def timeout(self, seconds):
+        self.client.timeout = seconds
 
     def __repr__(self):
         return f"Phone({self.serial!r})"
@@ -56,11 +63,7 @@ class Phone:
         with self.lock:
             if radio.kind_of(method):
                 return radio.start(self, method, arguments)
-            answer = self.client.call(method, arguments)
-            started = radio.kind_of(self.lock.started)
-            if started and started.proof == method:
-                self.lock.started = ""
-            return answer
+            return radio.call(self, method, arguments)
 
     def stop(self):
         """Ends whatever the radio does and returns a StopAnswer: the radio is proven off. Waits for calls

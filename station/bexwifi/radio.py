@@ -71,13 +71,30 @@ def switch_off(phone):
 
 @signals.undisturbed
 def switch_off_after(phone, error):
-    """Does so after an exception, if any. One that ends the program, such as KeyboardInterrupt, is not
-    replaced by RadioMayBeOn, whose words are on stderr then."""
+    """Does so after an exception, if any; tells whether the radio is off. An exception that ends the
+    program, such as KeyboardInterrupt, is not replaced by RadioMayBeOn, whose words are on stderr then."""
     try:
         switch_off(phone)
     except RadioMayBeOn:
         if error is None or isinstance(error, Exception):
             raise
+        return False
+    return True
+
+
+def call(phone, method, arguments):
+    """Calls a method that starts nothing, for who holds the lock."""
+    lock = phone.lock
+    try:
+        answer = phone.client.call(method, arguments)
+    except BaseException as error:
+        if not isinstance(error, BexWifiError) or error.may_go_on:
+            lock.started = lock.started or method  # a start must wait for its end
+        raise
+    kind = kind_of(lock.started)
+    if kind and kind.proof == method:
+        lock.started = ""
+    return answer
 
 
 @signals.holds
@@ -166,8 +183,7 @@ class Use:
         if problem is None and self._kind.proof:
             self._phone.lock.started = ""
             return
-        switch_off_after(self._phone, error)
-        if problem is None:
+        if not switch_off_after(self._phone, error) or problem is None:
             return
         if error is None and not isinstance(problem, CommandFailed):
             raise problem

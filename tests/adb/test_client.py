@@ -10,7 +10,7 @@ import subprocess
 
 import pytest
 
-from support.adb import TIMEOUT, Running, processes_of
+from support.adb import TIMEOUT, Running, held, processes_of
 from support.phone import ROOT
 from support.waiting import wait_for
 
@@ -36,23 +36,11 @@ def finish(process):
     return process.returncode, out, err
 
 
-@pytest.fixture(name="held")
-def held_fixture(phone):
-    """Holds a tool of the phone at each call until the test lets it go."""
+@pytest.fixture(name="hold")
+def hold_fixture(phone):
+    """Holds a tool of the phone until the test lets it go, or ends."""
     with contextlib.ExitStack() as ends:
-
-        def hold(tool):
-            waiting = phone.root / f"phone/faults/{tool}.waiting"
-            phone.fault(tool, "wait")
-            release = ends.enter_context(contextlib.ExitStack())
-            release.callback(phone.fault, tool, "clear")
-
-            def wait_until_waiting(count=1):
-                wait_for(lambda: waiting.exists() and len(waiting.read_text().split()) >= count)
-
-            return wait_until_waiting, release.close
-
-        yield hold
+        yield lambda tool: ends.enter_context(held(phone, tool))
 
 
 @pytest.mark.parametrize("name", ["my lab", "it's \"5 GHz\"", "$HOME `id` \\ *", ""])
@@ -99,8 +87,8 @@ def test_the_exit_code_of_a_failed_command(phone):
     assert len(err.splitlines()) == 1
 
 
-def test_the_exit_code_of_a_deadline(phone, held):
-    _, release = held("cat")
+def test_the_exit_code_of_a_deadline(phone, hold):
+    _, release = hold("cat")
     code, out, err = phone.shell(CLIENT, "--timeout", "0.5", "isSnifferMode")
     assert (code, out) == (5, b"")
     assert len(err.splitlines()) == 1
@@ -108,8 +96,8 @@ def test_the_exit_code_of_a_deadline(phone, held):
     assert phone.shell(CLIENT, "--timeout", str(TIMEOUT), "isSnifferMode") == (0, b"false\n", b"")
 
 
-def test_only_a_terminal_shows_how_long_a_call_takes(phone, held):
-    wait_until_waiting, release = held("cat")
+def test_only_a_terminal_shows_how_long_a_call_takes(phone, hold):
+    wait_until_waiting, release = hold("cat")
     line = ("-s", phone.serial, "shell")
     with phone.adb.start(*line, CLIENT, "isSnifferMode", stdin=subprocess.DEVNULL,
                          stdout=subprocess.PIPE, stderr=subprocess.PIPE) as piped:
@@ -123,9 +111,9 @@ def test_only_a_terminal_shows_how_long_a_call_takes(phone, held):
         assert finish(piped) == (0, b"false\n", b"")
 
 
-def test_the_lock_keeps_calls_apart_and_passes_the_exit_code_on(phone, held, tmp_path):
+def test_the_lock_keeps_calls_apart_and_passes_the_exit_code_on(phone, hold, tmp_path):
     lock = block_with("flock").replace("/tmp/", f"{tmp_path}/")
-    wait_until_waiting, release = held("wl")
+    wait_until_waiting, release = hold("wl")
     since = phone.log.stat().st_size
     with run_block(phone, lock, tmp_path) as one, run_block(phone, lock, tmp_path) as other:
         wait_until_waiting()
@@ -140,8 +128,8 @@ def test_the_lock_keeps_calls_apart_and_passes_the_exit_code_on(phone, held, tmp
 
 
 @pytest.mark.parametrize("end", ["kill", "disconnect"])
-def test_a_call_goes_on_when_adb_ends(phone, held, end):
-    wait_until_waiting, release = held("wl")
+def test_a_call_goes_on_when_adb_ends(phone, hold, end):
+    wait_until_waiting, release = hold("wl")
     since = phone.log.stat().st_size
     with phone.adb.start("-s", phone.serial, "shell", CLIENT, "RunTxStop", "6",
                          stdin=subprocess.DEVNULL, stdout=subprocess.PIPE) as adb:

@@ -72,8 +72,7 @@ def test_adb_outlives_the_service(phone):
     phone.up()
     assert launcher("restart-service", phone.folder).returncode == 0
     assert phone.shell("bex-wifi-client isSnifferMode") == (0, b"false\n", b"")
-    os.kill(int((phone.folder / "pid").read_text()), signal.SIGKILL)
-    wait_for(lambda: not phone.is_up())
+    phone.kill_service()
     assert phone.shell("bex-wifi-client isSnifferMode")[0] == 3
     assert launcher("up", phone.folder).returncode == 0
     assert phone.shell("bex-wifi-client isSnifferMode") == (0, b"false\n", b"")

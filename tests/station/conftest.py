@@ -16,6 +16,7 @@ def kit_environment(adb):
     with pytest.MonkeyPatch.context() as patch:
         for name, value in adb.environment.items():
             patch.setenv(name, value)
+        adb("start-server")
         yield
 
 
@@ -39,7 +40,7 @@ def simulated_fixture(phone_of):
     """A simulated phone; its faults end with the test."""
     phone = phone_of("broadcom")
     yield phone
-    for tool in ("wl", "ifconfig", "cat"):
+    for tool in ("wl", "ifconfig"):
         phone.fault(tool, "clear")
 
 
@@ -47,3 +48,11 @@ def simulated_fixture(phone_of):
 def phone_fixture(simulated):
     """The kit's phone for it."""
     return bexwifi.Phone(simulated.serial)
+
+
+@pytest.fixture(name="own")
+def own_fixture(adb):
+    """A phone that the test may spoil."""
+    with made_phone(adb, "wcn") as simulated:
+        simulated.up()
+        yield simulated

@@ -61,8 +61,8 @@ class AdbPhone(Phone):
         self.adb = adb
         self.serial = None
 
-    def up(self):
-        up = subprocess.run([PHONE, "up", self.folder, "--adb"], check=True, timeout=TIMEOUT,
+    def up(self, *port):
+        up = subprocess.run([PHONE, "up", self.folder, "--adb", *port], check=True, timeout=TIMEOUT,
                             stdout=subprocess.PIPE, text=True)
         self.serial = up.stdout.strip()
         wait_for(self.connects)
@@ -80,6 +80,11 @@ class AdbPhone(Phone):
     def down(self):
         super().down()
         self.forget()
+
+    def kill_service(self):
+        """Kills the service; the phone stays on adb."""
+        os.kill(int((self.folder / "pid").read_text()), signal.SIGKILL)
+        wait_for(lambda: not self.is_up())
 
     def do(self, *arguments, **options):
         """An adb command on this phone."""
@@ -118,6 +123,21 @@ def phone_fixture(adb):
     with made_phone(adb, "broadcom") as phone:
         phone.up()
         yield phone
+
+
+@contextlib.contextmanager
+def held(phone, tool):
+    """Holds a tool of the phone at each call. Gives two functions: one waits until so many calls wait, the
+    other lets all go on."""
+    waiting = phone.root / f"phone/faults/{tool}.waiting"
+    phone.fault(tool, "wait")
+    with contextlib.ExitStack() as ends:
+        ends.callback(phone.fault, tool, "clear")
+
+        def wait_until_waiting(count=1):
+            wait_for(lambda: waiting.exists() and len(waiting.read_text().split()) >= count)
+
+        yield wait_until_waiting, ends.close
 
 
 def processes_of(phone):

@@ -5,7 +5,8 @@
 
 def radio_use(phone):
     """"idle", "tx", "rx", "tone" or "monitor"."""
-    text = (phone.root / "phone/state/radio").read_text()
+    radio = phone.root / "phone/state/radio"
+    text = radio.read_text() if radio.exists() else "engine=idle"  # no tool has run yet
     state = dict(line.replace("'", "").split("=", 1) for line in text.splitlines())
     mode = phone.root / "sys/module/wlan/parameters/con_mode"
     if mode.exists() and mode.read_text().strip() == "4":
