@@ -96,7 +96,7 @@ class Adb:
                 process.wait()
             process.stdout.close()
             process.stderr.close()
-        signals.deliver()
+        signals.checkpoint()
         return Output(process.returncode, out.decode(errors="replace"), err.decode(errors="replace"))
 
     def _failure(self, output):

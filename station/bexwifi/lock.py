@@ -6,6 +6,7 @@ import contextlib
 import fcntl
 import logging
 import os
+import sys
 import threading
 
 from bexwifi import signals
@@ -49,23 +50,30 @@ class PhoneLock:
 
     @signals.holds
     def __enter__(self):
-        while not self._thread.acquire(timeout=0.2):
-            signals.deliver()
+        signals.watch()
         try:
-            if self._depth == 0:
-                self._take()
-            self._depth += 1
+            while not self._thread.acquire(timeout=0.2):
+                signals.checkpoint()
+            try:
+                if self._depth == 0:
+                    self._take()
+                self._depth += 1
+            except BaseException:
+                self._thread.release()
+                raise
         except BaseException:
-            self._thread.release()
+            signals.unwatch()
             raise
         return self
 
-    @signals.holds
+    @signals.undisturbed
     def __exit__(self, *_):
         self._depth -= 1
         if self._depth == 0:
             os.close(self._descriptor)
         self._thread.release()
+        signals.unwatch()
+        signals.leave(sys._getframe(1))  # pylint: disable=protected-access
 
     def _take(self):
         descriptor = self._open()

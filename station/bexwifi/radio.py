@@ -104,21 +104,17 @@ def start(phone, method, arguments):
     lock = phone.lock
     if lock.user:
         raise WrongUsage(phone.serial, f"{method} inside the `with` block of {lock.user}: leave it first")
-    signals.watch()
+    if lock.started:
+        switch_off(phone)
+    lock.started = method
     try:
-        if lock.started:
-            switch_off(phone)
-        lock.started = method
-        try:
-            return phone.client.call(method, arguments)
-        except BaseException as error:
-            if isinstance(error, BexWifiError) and not error.radio_may_be_on:
-                lock.started = ""
-            else:
-                switch_off_after(phone, error)
-            raise
-    finally:
-        signals.unwatch()
+        return phone.client.call(method, arguments)
+    except BaseException as error:
+        if isinstance(error, BexWifiError) and not error.radio_may_be_on:
+            lock.started = ""
+        else:
+            switch_off_after(phone, error)
+        raise
 
 
 class Use:
@@ -141,16 +137,11 @@ class Use:
 
     @signals.holds
     def __enter__(self):
-        signals.watch()
-        try:
-            self._phone.lock.__enter__()
-        except BaseException:
-            signals.unwatch()
-            raise
+        lock = self._phone.lock.__enter__()
         try:
             self.started = start(self._phone, self._method, self._arguments)
-            self._phone.lock.user = self._method
-            signals.deliver()
+            lock.user = self._method
+            signals.checkpoint()
             return self
         except BaseException as error:
             self._leave(error)
@@ -159,6 +150,7 @@ class Use:
     @signals.undisturbed
     def __exit__(self, kind, error, trace):
         self._leave(error)
+        signals.leave(sys._getframe(1))  # pylint: disable=protected-access
 
     @signals.undisturbed
     def _leave(self, error):
@@ -170,7 +162,6 @@ class Use:
                     self._end(error)
         finally:
             lock.__exit__()
-            signals.unwatch()
 
     def _end(self, error):
         """Ends the use. `error` is what the block raised."""

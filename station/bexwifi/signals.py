@@ -6,9 +6,9 @@ A signal keeps its effect: Ctrl-C raises KeyboardInterrupt, SIGTERM ends the pro
 handler is called. It only waits until the radio is off, and does not come in the middle of switching it
 on or off. Functions are marked with what a signal does while they run:
 
-    holds          waits until they call deliver() ...
+    holds          waits until they call checkpoint() ...
     interruptible  ... except in these, which they call
-    undisturbed    waits, whatever they call
+    undisturbed    waits, whatever they call, until they call leave()
 
 The marks of the functions on the stack decide, not a counter, so there is no moment between a function's
 call and its first statement in which a signal gets through. Python gives signals to its main thread
@@ -80,21 +80,12 @@ def watch():
     global _watchers  # pylint: disable=global-statement
     if threading.current_thread() is not threading.main_thread():
         return
+    for number in NUMBERS:
+        before = signal.getsignal(number)
+        if before is not _came and (callable(before) or before == signal.SIG_DFL):
+            _before[number] = before
+            signal.signal(number, _came)
     _watchers += 1
-    if _watchers == 1:
-        for number in NUMBERS:
-            before = signal.getsignal(number)
-            if (callable(before) or before == signal.SIG_DFL) and before is not _came:
-                _before[number] = before
-                signal.signal(number, _came)
-
-
-@interruptible
-def deliver():
-    """Lets the signals that waited take effect; may raise what their handlers raise."""
-    if threading.current_thread() is threading.main_thread():
-        while _waiting and _before and not _must_wait(sys._getframe()):  # pylint: disable=protected-access
-            _act(_waiting.pop(0), None)
 
 
 def unwatch():
@@ -112,3 +103,17 @@ def unwatch():
         _waiting.clear()
         for number in waiting:
             signal.raise_signal(number)
+
+
+@interruptible
+def checkpoint():
+    """Lets the signals that waited take effect, unless something undisturbed runs. May raise what their
+    handlers raise."""
+    leave(sys._getframe())  # pylint: disable=protected-access
+
+
+def leave(frame):
+    """The same, for a function that has done its work and is about to return to this frame."""
+    if threading.current_thread() is threading.main_thread() and not _must_wait(frame):
+        while _waiting and _before:
+            _act(_waiting.pop(0), frame)
