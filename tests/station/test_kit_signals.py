@@ -63,6 +63,8 @@ class PretendedAdb:
 class AtMoments:
     """Raises SIGINT when the kit comes to the given moments: a call, line or return of its own code each."""
 
+    running = None
+
     def __init__(self, *moments):
         self.left = set(moments)
         self.count = 0
@@ -78,6 +80,7 @@ class AtMoments:
         return self
 
     def watch(self, function):
+        AtMoments.running = self
         before = sys.gettrace()
         sys.settrace(self)
         try:
@@ -132,14 +135,19 @@ def interrupted_at(phone, function, *moments):
 
 
 def test_an_interrupt_at_any_line_of_the_kit(pretended):
+    bodies = []
+
     def use():
         with pretended.transmit("RunTxBGStart", 6):
             assert PretendedAdb.on
+            bodies.append((moment, AtMoments.running.count))
 
     moment = 1
     while interrupted_at(pretended, use, moment):
         moment += 1
     assert moment > 200
+    # A block that is interrupted before it begins does not run, except where that comes in the last lines.
+    assert bodies[0][0] > bodies[-1][1] - 10
 
 
 @pytest.mark.parametrize("distance", [1, 2, 3, 5, 8, 13, 21])
@@ -226,6 +234,7 @@ def test_a_signal_in_a_start(simulated, request, number):
 
 def test_signals_while_the_radio_is_switched_off(program, simulated):
     assert program.stdout.readline() == "on\n"
+    since = simulated.log.stat().st_size
     with held(simulated, "wl") as (wait_until_waiting, release):
         program.stdin.write("\n")
         program.stdin.flush()
@@ -238,6 +247,7 @@ def test_signals_while_the_radio_is_switched_off(program, simulated):
         program.wait(TIMEOUT)
     assert program.returncode in (-signal.SIGTERM, -signal.SIGHUP)
     ends_by(-program.returncode, program, simulated)
+    assert [line for line, _ in simulated.commands(since)] == simulated.explain("RunTxStop", "6")
 
 
 def test_a_signal_while_another_program_uses_the_phone(simulated, request):
