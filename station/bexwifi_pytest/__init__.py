@@ -100,6 +100,12 @@ def pytest_generate_tests(metafunc):
         phones.parametrize(metafunc, metafunc.config.option.wifi_phone)
 
 
+def pytest_report_teststatus(report):
+    if getattr(report, "wifi_interrupted", False):
+        return "interrupted", "I", "INTERRUPTED"
+    return None
+
+
 @pytest.fixture(scope="session")
 def phone(request):
     """The bexwifi.Phone that the test runs on."""

@@ -40,13 +40,22 @@ class Interrupts:
 
 
 class Workers:
-    """A plugin of xdist's controller: when the run ends early, it interrupts what the workers do, and
+    """A plugin of xdist's controller. When the run ends early, it interrupts what the workers do, and
     takes their reports until the last one has ended. By itself the controller would take no more
     reports, and kill a worker that needs more than some seconds."""
 
     def __init__(self, dsession):
         self.dsession = dsession
         self.running = set()
+
+    @pytest.hookimpl(hookwrapper=True, optionalhook=True)
+    def pytest_xdist_newgateway(self):
+        """With -v xdist first asks a new worker about its Python, and the tests may then run outside the
+        worker's main thread, where the kit cannot see a signal."""
+        options = self.dsession.config.option
+        verbose, options.verbose = options.verbose, 0
+        yield
+        options.verbose = verbose
 
     @pytest.hookimpl(optionalhook=True)
     def pytest_testnodeready(self, node):

@@ -31,8 +31,8 @@ def parametrize(metafunc, serials):
     metafunc.parametrize("phone", [
         pytest.param(serial, id=identifier(serial),
                      # All tests of a phone run in one worker.
-                     marks=[pytest.mark.xdist_group(identifier(serial))] if xdist else [])
-        for serial in serials], indirect=True, scope="session")
+                     marks=[pytest.mark.xdist_group(str(number))] if xdist else [])
+        for number, serial in enumerate(serials, 1)], indirect=True, scope="session")
 
 
 def without_group(nodeid):

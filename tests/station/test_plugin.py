@@ -36,7 +36,7 @@ def station_fixture(pytester, monkeypatch):
     monkeypatch.setenv("PYTHONPATH", str(ROOT / "station"))
 
     def run(plan, *arguments, phones=("R1", "R2"), before="", report="report"):
-        pytester.makepyfile(plan=f"import os, pytest, signal, time\n{plan}")
+        pytester.makepyfile(plan=f"import os, pytest, signal, threading, time\n{plan}")
         for each in phones:
             with open(pytester.path / "logs" / each.replace("/", "_"), "a", encoding="ascii") as log:
                 log.write(LINE.format(0, "before"))
@@ -75,6 +75,7 @@ def test_sweep(phone, measure, channel):
     for rate in 6, 54:
         measure("loss", 0.5 * rate, "%", high=20, at={"channel": channel, "rate": rate})
     measure("worker", os.environ.get("PYTEST_XDIST_WORKER", "none"))
+    assert threading.current_thread() is threading.main_thread()
 
 def test_serial(phone, measure):
     assert measure("length", len(phone.serial), low=2, high=2)
@@ -82,11 +83,12 @@ def test_serial(phone, measure):
 """
 
 
-@pytest.mark.parametrize("arguments, workers", [([], 1), (["-n2", "--dist=load"], 2)])
+@pytest.mark.parametrize("arguments, workers", [([], 1), (["-n2", "-v", "--dist=load"], 2)])
 def test_every_phone_runs_every_test_in_one_worker(station, arguments, workers):
     done = station(SWEEP, *arguments)
     assert done.ret == 1
     done.stdout.fnmatch_lines(["loss at channel=6, rate=54: 27 % is above 20"])
+    done.stdout.no_fnmatch_line("* cwd: *")  # xdist has asked, and may leave the main thread
     assert outcomes(station) == [
         (phone, *rest) for phone in ("R1", "R2") for rest in (
             ("plan.py::test_serial", "passed", ""),
@@ -255,6 +257,7 @@ def test_last(phone):
     pass
 """, *arguments)
     assert done.ret == pytest.ExitCode.INTERRUPTED
+    done.stdout.fnmatch_lines(["* interrupted in *"])
     assert (station.report.parent / "R2.off").exists()
     found = outcomes(station)
     one = "interrupted" if arguments else "passed"
