@@ -89,6 +89,14 @@ def pytest_sessionstart(session):
         config.pluginmanager.register(Workers(config.pluginmanager.getplugin("dsession")))
 
 
+@pytest.hookimpl(hookwrapper=True)
+def pytest_sessionfinish(session):
+    """What ends a run is done to its end."""
+    if INTERRUPTS in session.config.stash:
+        session.config.stash[INTERRUPTS].ignored = True
+    yield
+
+
 def pytest_unconfigure(config):
     if INTERRUPTS in config.stash:
         config.stash[INTERRUPTS].restore()

@@ -3,12 +3,10 @@
 """Ctrl-C, SIGTERM and SIGHUP end a run in good order: every radio off, and what has run in the report.
 
 The first signal interrupts the test that runs; its `with` blocks switch the radio off. Further ones do
-nothing, so that they do not interrupt that: Ctrl-C at a terminal reaches xdist's workers twice, from the
-terminal and from the controller.
+nothing, so that they do not interrupt that, nor the report: Ctrl-C at a terminal reaches xdist's workers
+twice, from the terminal and from the controller.
 """
 
-import contextlib
-import os
 import queue
 import signal
 import time
@@ -20,18 +18,21 @@ PATIENCE = 600
 
 
 class Interrupts:
-    """Handles the signals of this process until restore()."""
+    """Handles the signals of this process until restore().
+
+    ignored: whether they do nothing from here on
+    """
 
     def __init__(self):
-        self.came = False
+        self.ignored = False
         self.before = {}
         for number in (signal.SIGINT, signal.SIGTERM, signal.SIGHUP):
             if signal.getsignal(number) != signal.SIG_IGN:  # as under nohup
                 self.before[number] = signal.signal(number, self._interrupt)
 
     def _interrupt(self, _number, _frame):
-        if not self.came:
-            self.came = True
+        if not self.ignored:
+            self.ignored = True
             raise KeyboardInterrupt
 
     def restore(self):
@@ -68,13 +69,16 @@ class Workers:
     @pytest.hookimpl(tryfirst=True)
     def pytest_sessionfinish(self):
         for node in self.running:
-            with contextlib.suppress(OSError):
-                os.kill(node.gateway._io.popen.pid, signal.SIGINT)  # execnet has no other way to tell
+            node.gateway._io.popen.send_signal(signal.SIGINT)  # execnet has no other way to tell
         deadline = time.monotonic() + PATIENCE
         while self.running and time.monotonic() < deadline:
-            with contextlib.suppress(queue.Empty):
+            try:
                 name, event = self.dsession.queue.get(timeout=1)
-                if name == "testreport":
-                    self.dsession.worker_testreport(**event)
-                elif name in ("workerfinished", "errordown"):
-                    self.running.discard(event["node"])
+            except queue.Empty:
+                # The signal may have come just when the controller had taken a worker's last word.
+                self.running = {node for node in self.running if not node.channel.isclosed()}
+                continue
+            if name == "testreport":
+                self.dsession.worker_testreport(**event)
+            elif name in ("workerfinished", "errordown"):
+                self.running.discard(event["node"])

@@ -4,12 +4,16 @@
 
 import csv
 import os
+import queue
+import signal
 import xml.etree.ElementTree as ET
+from unittest import mock
 
 import lxml.html
 import pytest
 
-from support.adb import TIMEOUT
+from bexwifi_pytest.interrupts import Workers
+from support.adb import TIMEOUT, Running
 from support.phone import ROOT
 
 pytest_plugins = ["pytester"]
@@ -269,6 +273,28 @@ def test_last(phone):
     assert rows(station, "phone", "value") == [("R1", "5"), ("R1", "6"), ("R2", "5"), ("R2", "6")]
     assert "The run was interrupted" in text_of(station, "report.html")
     assert 'name="test_last[R2]"' not in text_of(station, "junit.xml")
+
+
+def test_a_signal_does_not_disturb_the_report(station, pytester):
+    pytester.makeconftest("""
+import os, signal
+def pytest_sessionfinish():
+    os.kill(os.getpid(), signal.SIGINT)
+""")
+    assert station("def test_a(phone):\n    pass", phones=["R1"]).ret == 0
+    assert outcomes(station) == [("R1", "plan.py::test_a", "passed", "")]
+
+
+def test_the_run_ends_when_a_worker_s_last_word_was_lost():
+    with Running(["sleep", str(TIMEOUT)]) as process:
+        worker = mock.Mock()
+        worker.gateway._io.popen = process
+        worker.channel.isclosed = lambda: process.poll() is not None
+        workers = Workers(mock.Mock(queue=queue.Queue()))
+        workers.pytest_testnodeready(worker)
+        workers.pytest_sessionfinish()
+    assert process.returncode == -signal.SIGINT
+    assert workers.running == set()
 
 
 def test_a_worker_that_dies_takes_no_results_with_it(station):
