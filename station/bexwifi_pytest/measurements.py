@@ -27,7 +27,11 @@ def number(value):
     """The same number as int or float, whatever type it had; None when it is no number."""
     if isinstance(value, bool) or not isinstance(value, (numbers.Real, decimal.Decimal)):
         return None
-    return int(value) if isinstance(value, numbers.Integral) else float(value)
+    try:
+        known = float(value)
+    except OverflowError:
+        return None
+    return int(value) if isinstance(value, numbers.Integral) else known
 
 
 def shown(value):

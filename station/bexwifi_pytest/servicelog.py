@@ -34,14 +34,10 @@ class ServiceLog:
         return [LINE.sub(r"\1 \2", line) for line in now[self._known(now):]]
 
     def _known(self, now):
-        """How many lines of the log were there before."""
-        count = len(self.before)
-        if now[:count] == self.before:
-            return count
-        # It has lost lines at its beginning: what is left of `before` ends somewhere in it.
-        for length in range(min(count, len(now)), 0, -1):
-            if now[:length] == self.before[-length:]:
-                return length
+        """How many lines of the log were there before: its beginning up to the last one."""
+        for count in range(len(now) if self.before else 0, 0, -1):
+            if now[count - 1] == self.before[-1] and now[:count] == self.before[-count:]:
+                return count
         return 0
 
     def _read(self):

@@ -39,6 +39,7 @@ def test_a_missed_limit_tells_where_and_the_unit():
     (5, {"low": 2, "high": 1}, "loss: the limits are the wrong way round: low=2 is above high=1"),
     (5, {"low": math.nan}, "loss: the limit nan is no number"),
     (5, {"high": "7"}, "loss: the limit '7' is no number"),
+    (10 ** 310, {"low": 1}, f"loss: {10 ** 310} is neither a number nor a text"),
     (None, {}, "loss: None is neither a number nor a text"),
     ("5", {"low": 1}, "loss: '5' has limits but is no number"),
     (True, {"low": 1}, "loss: True has limits but is no number")])
