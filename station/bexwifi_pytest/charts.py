@@ -55,10 +55,15 @@ class Chart:
         return self._element(ET.fromstring(out.getvalue()), prefix)
 
     def _draw(self, axes):
-        places = self._places()
+        places = dict.fromkeys(place for points in self.lines.values() for place, _ in points)
+        if all(number(place) is not None for place in places):
+            places = {place: place for place in places}
+        else:  # texts stand side by side
+            places = {place: index for index, place in enumerate(places)}
+            axes.set_xticks(range(len(places)), [clipped(shown(place)) for place in places])
         for index, (label, points) in enumerate(self.lines.items()):
-            points = sorted(points, key=lambda point: places(point[0]))
-            x = [places(place) for place, _ in points]
+            points = sorted(points, key=lambda point: places[point[0]])
+            x = [places[place] for place, _ in points]
             measurements = [each for _, each in points]
             colour = f"C{index % 10}"
             axes.plot(x, [each.value for each in measurements], "o-", color=colour, markersize=4,
@@ -77,13 +82,6 @@ class Chart:
         axes.grid(alpha=0.3)
         if axes.get_legend_handles_labels()[1]:
             axes.legend(fontsize="small", loc="center left", bbox_to_anchor=(1, 0.5))
-
-    def _places(self):
-        """Where on the axis something is: a number at its value, texts side by side."""
-        places = list(dict.fromkeys(place for points in self.lines.values() for place, _ in points))
-        if all(number(place) is not None for place in places):
-            return float
-        return {place: index for index, place in enumerate(places)}.get
 
     def _element(self, root, prefix):
         for element in root.iter():

@@ -2,11 +2,15 @@
 # SPDX-License-Identifier: Apache-2.0
 """The station's page in a browser: what it shows, and that it needs nothing and nobody."""
 
+import math
+
+import lxml.etree
 import pytest
 
 from bexwifi_pytest import page
+from bexwifi_pytest.charts import Chart
 from bexwifi_pytest.measurements import Measurement, printable
-from bexwifi_pytest.results import Failure, Result, Run
+from bexwifi_pytest.results import Failure, Result, Results, Run
 from support.browser import opened
 
 HOSTILE = "</td><script>document.title='taken'</script><img src=http://example.invalid/>&amp;\"'$\\frac$\u202e"
@@ -75,6 +79,19 @@ def test_a_chart_of_each_sweep(shown):
     assert shown.evaluate(labels) == ["rate over channel, 2 lines", f"{printable(HOSTILE)} over channel, 2 lines"]
     legend = "[...document.querySelectorAll('#phone-1 figure text')].map(each => each.textContent)"
     assert {"rate=6", "rate=54", "limit", "limit missed", "packets"} <= set(shown.evaluate(legend))
+
+
+def test_a_chart_over_names_shows_them():
+    chart = Chart("time", [Measurement.of("time", value, at={"standard": name})
+                           for value, name in enumerate(["802.11b", "802.11ax", 7])])
+    drawn = [each.text for each in lxml.etree.fromstring(chart.svg("a")).iter("{*}text")]
+    assert drawn[:3] == ["802.11b", "802.11ax", "7"]
+
+
+def test_a_sweep_without_a_number_has_no_chart():
+    results = Results([Result("R1", "a", "passed", measurements=[
+        Measurement.of("loss", value, at={"channel": 6}) for value in (math.nan, math.inf, "none")])])
+    assert page.charts(results, "a") == []
 
 
 def test_the_command_lines_behind_a_failure(shown):
