@@ -22,7 +22,14 @@ def html(run):
 
 
 def charts(results, prefix):
-    """(title, SVG) of each sweep that has a number to show."""
+    """(title, SVG) of each sweep that has a number to show; a title alone where matplotlib is missing."""
     drawn = [Chart(name, measurements) for name, measurements in results.sweeps.items()]
-    return [(chart.title, chart.svg(f"{prefix}-{index}-"))
+    return [(chart.title, svg_of(chart, f"{prefix}-{index}-"))
             for index, chart in enumerate(drawn) if chart.lines]
+
+
+def svg_of(chart, prefix):
+    try:
+        return chart.svg(prefix)
+    except ImportError:
+        return ""

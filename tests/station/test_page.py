@@ -3,6 +3,7 @@
 """The station's page in a browser: what it shows, and that it needs nothing and nobody."""
 
 import math
+import sys
 
 import lxml.etree
 import pytest
@@ -92,6 +93,15 @@ def test_a_sweep_without_a_number_has_no_chart():
     results = Results([Result("R1", "a", "passed", measurements=[
         Measurement.of("loss", value, at={"channel": 6}) for value in (math.nan, math.inf, "none")])])
     assert page.charts(results, "a") == []
+
+
+def test_a_station_without_matplotlib_has_a_page(monkeypatch):
+    monkeypatch.setitem(sys.modules, "matplotlib", None)
+    run = Run(["R1"])
+    run.results += results_of("R1", "rate")
+    text = page.html(run)
+    assert "No chart: python3-matplotlib is not installed." in text
+    assert "<svg" not in text
 
 
 def test_the_command_lines_behind_a_failure(shown):
