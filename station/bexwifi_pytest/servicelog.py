@@ -20,17 +20,14 @@ class ServiceLog:
 
     def __init__(self, serial):
         self.adb = Adb(serial)
-        try:
-            self.before = self._read()
-        except bexwifi.BexWifiError:
-            self.before = []
+        self.before, self.problem = self._read()
 
     def lines(self):
         """Time and message of each line, or why there are none."""
-        try:
-            now = self._read()
-        except bexwifi.BexWifiError as error:
-            return [f"the log cannot be read: {error}"]
+        if not self.problem:
+            now, self.problem = self._read()
+        if self.problem:
+            return [f"the log cannot be read: {self.problem}"]
         return [LINE.sub(r"\1 \2", line) for line in now[self._known(now):]]
 
     def _known(self, now):
@@ -41,5 +38,11 @@ class ServiceLog:
         return 0
 
     def _read(self):
-        output = self.adb.shell("logcat", "-d", "-v", "threadtime", "-s", *RUNNERS, timeout=TIMEOUT)
-        return [line for line in output.stdout.splitlines() if not line.startswith("--------- ")]
+        """The log's lines and None, or none and the reason."""
+        try:
+            output = self.adb.shell("logcat", "-d", "-v", "threadtime", "-s", *RUNNERS, timeout=TIMEOUT)
+        except bexwifi.BexWifiError as error:
+            return [], error
+        if output.code != 0:
+            return [], output.stderr.strip() or f"logcat ended with {output.code}"
+        return [line for line in output.stdout.splitlines() if not line.startswith("--------- ")], None

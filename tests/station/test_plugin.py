@@ -171,11 +171,12 @@ def test_right(phone, measure):
 
 
 def test_an_exception_of_the_kit_shows_the_plan_s_line_and_its_own(station):
-    done = station("def test_a(phone):\n    phone.doctor()", phones=["R1"])
-    message = "bexwifi.errors.UnknownPhone: phone R1: adb does not know it: see adb devices -l"
+    done = station("def test_a(phone):\n    phone.doctor()", phones=["R/1"])
+    message = "bexwifi.errors.UnknownPhone: phone R/1: adb does not know it: see adb devices -l"
     assert [line for line in done.outlines if line[:1] in ("E", ">")] == [
         ">       phone.doctor()", f"E       {message}"]
-    assert outcomes(station) == [("R1", "plan.py::test_a", "failed", message)]
+    done.stdout.fnmatch_lines(["the log cannot be read: cat: *R/1*"])
+    assert outcomes(station) == [("R/1", "plan.py::test_a", "failed", message)]
 
 
 def test_each_outcome(station):
