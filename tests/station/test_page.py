@@ -13,6 +13,7 @@ from bexwifi_pytest.charts import Chart
 from bexwifi_pytest.measurements import Measurement, printable
 from bexwifi_pytest.results import Failure, Result, Results, Run
 from support.browser import opened
+from support.waiting import wait_for
 
 HOSTILE = "</td><script>document.title='taken'</script><img src=http://example.invalid/>&amp;\"'$\\frac$\u202e"
 COMMAND = 'cmd: "wl channel 6" unsuccessful execution'
@@ -131,7 +132,7 @@ def test_the_keyboard_is_enough(shown):
     assert shown.evaluate(focus) == "skip"
     assert shown.evaluate("document.activeElement.getBoundingClientRect().left >= 0")
     shown.press("Enter")
-    assert shown.evaluate("document.activeElement.id") == "results"
+    wait_for(lambda: shown.evaluate("document.activeElement.id") == "results")
     for _ in range(10):
         shown.press("Tab")
         if shown.evaluate(focus) == "summary":
@@ -140,7 +141,7 @@ def test_the_keyboard_is_enough(shown):
     opened_details = "document.activeElement.parentElement.open"
     assert not shown.evaluate(opened_details)
     shown.press("Enter")
-    assert shown.evaluate(opened_details)
+    wait_for(lambda: shown.evaluate(opened_details))
 
 
 def test_no_complaint_and_no_request(shown):

@@ -13,10 +13,12 @@ import lxml.html
 import pytest
 
 from bexwifi_pytest.interrupts import Workers
-from support.adb import TIMEOUT, Running
+from support.adb import Running
 from support.phone import ROOT
 
 pytest_plugins = ["pytester"]
+# For a whole run of pytest, in seconds.
+TIMEOUT = 300
 
 # Has a log for each phone: "logs/R1".
 ADB = """#!/bin/sh
