@@ -8,9 +8,9 @@ readonly BUILD_PACKAGES=(g++ cmake ninja-build hidl-gen android-libbase-dev andr
     android-liblog-dev android-libutils-dev libtinyxml2-dev libgtest-dev libgmock-dev libbenchmark-dev)
 readonly PHONE_PACKAGES=(busybox python3 mksh bubblewrap proot)
 readonly PACKAGE_PACKAGES=(python3 groff-base dpkg-dev file)
-readonly TEST_PACKAGES=("${PACKAGE_PACKAGES[@]}" git make adb python3-pytest
-    python3-pytest-xdist python3-lxml python3-jsonschema python3-jinja2 python3-matplotlib chromium
-    checkpolicy m4 valgrind)
+readonly STATION_PACKAGES=(adb python3-pytest python3-pytest-xdist python3-matplotlib python3-jinja2)
+readonly TEST_PACKAGES=("${PACKAGE_PACKAGES[@]}" "${STATION_PACKAGES[@]}" git make python3-lxml
+    python3-jsonschema chromium checkpolicy m4 valgrind)
 readonly BENCH_PACKAGES=(python3 valgrind)
 readonly FORMAT_PACKAGES=(git clang-format blueprint-tools)
 readonly CHECK_PACKAGES=("${FORMAT_PACKAGES[@]}" clang clang-tidy shellcheck make python3
@@ -22,6 +22,7 @@ readonly FUZZ_PACKAGES=(clang libclang-rt-dev llvm)
 packages_of() {
     case $1 in
         demo | phone | client | explain | catalogue) echo "${BUILD_PACKAGES[*]} ${PHONE_PACKAGES[*]}" ;;
+        station) echo "${BUILD_PACKAGES[*]} ${PHONE_PACKAGES[*]} ${STATION_PACKAGES[*]}" ;;
         package) echo "${BUILD_PACKAGES[*]} ${PACKAGE_PACKAGES[*]}" ;;
         test | soak) echo "${BUILD_PACKAGES[*]} ${PHONE_PACKAGES[*]} ${TEST_PACKAGES[*]}" ;;
         arm64) echo "$(packages_of test) ${ARM64_PACKAGES[*]}" ;;

@@ -3,11 +3,12 @@
 # SPDX-License-Identifier: Apache-2.0
 """Runs a command, and when it ends, ends everything that it has started.
 
-usage: tools/dev/supervise.py COMMAND [ARGUMENT]...
+usage: tools/dev/supervise.py [--clean-up SECONDS] COMMAND [ARGUMENT]...
 
 Ctrl-C and the other signals that end a program reach the command's process group as one SIGINT, and
-the group may clean up for a while. What still runs after that, in any session or group, is killed;
-after a second Ctrl-C at once. The exit code is the command's own, or 130 after a signal.
+the group may clean up for a while, 20 seconds unless told otherwise. What still runs after that, in any
+session or group, is killed; after a second Ctrl-C at once. The exit code is the command's own, or 130
+after a signal.
 """
 
 import contextlib
@@ -22,6 +23,7 @@ import time
 PR_SET_CHILD_SUBREAPER = 36
 SIGNALS = (signal.SIGINT, signal.SIGTERM, signal.SIGHUP, signal.SIGQUIT)
 SECONDS_TO_CLEAN_UP = 20
+USAGE = "usage: supervise.py [--clean-up SECONDS] COMMAND [ARGUMENT]..."
 
 
 def descendants(parent):
@@ -69,7 +71,7 @@ def exists(group):
     return True
 
 
-def main(command):
+def main(command, seconds_to_clean_up):
     ctypes.CDLL(None).prctl(PR_SET_CHILD_SUBREAPER, 1, 0, 0, 0)
     received = []
 
@@ -93,12 +95,19 @@ def main(command):
         return code if code >= 0 else 128 - code
     with contextlib.suppress(ProcessLookupError):
         os.killpg(started.pid, signal.SIGINT)
-    deadline = time.monotonic() + SECONDS_TO_CLEAN_UP
+    deadline = time.monotonic() + seconds_to_clean_up
     end_the_rest(lambda: len(received) == 1 and time.monotonic() < deadline and exists(started.pid))
     return 130
 
 
+def seconds_and_command(words):
+    if words[:1] == ["--clean-up"] and len(words) > 1 and words[1].isdigit():
+        return int(words[1]), words[2:]
+    return SECONDS_TO_CLEAN_UP, words
+
+
 if __name__ == "__main__":
-    if len(sys.argv) < 2:
-        sys.exit("usage: supervise.py COMMAND [ARGUMENT]...")
-    sys.exit(main(sys.argv[1:]))
+    seconds, words = seconds_and_command(sys.argv[1:])
+    if not words:
+        sys.exit(USAGE)
+    sys.exit(main(words, seconds))
