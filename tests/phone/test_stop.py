@@ -71,7 +71,7 @@ def test_after_a_start_that_is_still_running(phone):
     """What a stop ends while the start is at its first command, that start begins afterwards."""
     tool = phone.explain(*TRANSMIT)[0].split()[0].rpartition("/")[2]
     stage(phone, tool, "wait")
-    code, out, err = phone.call("--timeout", "2", *TRANSMIT)
+    code, out, err = phone.call("--timeout", "5", *TRANSMIT)
     assert (code, out) == (5, b"")
     assert err.endswith(HINT)
     wait_for((phone.root / f"phone/faults/{tool}.waiting").exists)
