@@ -22,13 +22,13 @@ Needs Python 3.9 or newer, nothing but its standard library, and the program `ad
 from bexwifi.answers import Answer, Argument, Check, Doctor, Method, StopAnswer, StopCall
 from bexwifi.errors import (
     AdbFailed, BexWifiError, CommandFailed, DeadlinePassed, Interrupted, NoAnswer, NoClient, NoCount,
-    NoService, NotWritten, Offline, RadioMayBeOn, TransportFailed, Unauthorised, UnknownPhone,
+    NoLock, NoService, NotWritten, Offline, RadioMayBeOn, TransportFailed, Unauthorised, UnknownPhone,
     WrongClient, WrongUsage)
 from bexwifi.phone import Phone
 from bexwifi.radio import EndedByStop, Reception, Use
 
 __all__ = [
     "AdbFailed", "Answer", "Argument", "BexWifiError", "Check", "CommandFailed", "DeadlinePassed",
-    "Doctor", "EndedByStop", "Interrupted", "Method", "NoAnswer", "NoClient", "NoCount", "NoService",
-    "NotWritten", "Offline", "Phone", "RadioMayBeOn", "Reception", "StopAnswer", "StopCall",
+    "Doctor", "EndedByStop", "Interrupted", "Method", "NoAnswer", "NoClient", "NoCount", "NoLock",
+    "NoService", "NotWritten", "Offline", "Phone", "RadioMayBeOn", "Reception", "StopAnswer", "StopCall",
     "TransportFailed", "Unauthorised", "UnknownPhone", "Use", "WrongClient", "WrongUsage"]

@@ -99,6 +99,11 @@ class WrongClient(BexWifiError):
     """The phone's client is of another version, whose answers this kit does not understand."""
 
 
+class NoLock(BexWifiError):
+    """The phone's lock cannot be taken: its file cannot be opened. Nothing was called."""
+    _may_have_begun = False
+
+
 class RadioMayBeOn(BexWifiError):
     """The radio could not be switched off, or nothing proves that it is. The same words are on stderr.
     Restart the phone or take it away from the station."""

@@ -10,6 +10,7 @@ import sys
 import threading
 
 from bexwifi import signals
+from bexwifi.errors import NoLock
 
 LOG = logging.getLogger("bexwifi")
 # The same file as in the README of bex-wifi-client, so that shell scripts with `flock` take turns too.
@@ -89,11 +90,14 @@ class PhoneLock:
             raise
 
     def _open(self):
-        """The file's descriptor. Another user's file may be locked but not written."""
-        for flags in (os.O_RDWR, os.O_RDONLY, os.O_RDWR | os.O_CREAT):
-            with contextlib.suppress(FileNotFoundError, PermissionError):
-                return os.open(self._path, flags | os.O_NOFOLLOW, 0o666)
-        return os.open(self._path, os.O_RDWR | os.O_CREAT | os.O_NOFOLLOW, 0o666)
+        """The file's descriptor. Another user's file can be locked, but perhaps not written."""
+        try:
+            for flags in (os.O_RDWR, os.O_RDONLY):
+                with contextlib.suppress(FileNotFoundError, PermissionError):
+                    return os.open(self._path, flags | os.O_NOFOLLOW)
+            return os.open(self._path, os.O_RDWR | os.O_CREAT | os.O_NOFOLLOW, 0o666)
+        except OSError as error:
+            raise NoLock(self._serial, f"no lock: {self._path}: {error.strerror}") from error
 
     @property
     def started(self):
