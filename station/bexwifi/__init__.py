@@ -13,7 +13,8 @@
 
 The radio is off after each `with` block, however the block ends: by an exception, a deadline, SIGINT,
 SIGTERM or SIGHUP, or with a phone that was unplugged and comes back. Where that cannot be proven,
-RadioMayBeOn is raised and a line on stderr says so.
+RadioMayBeOn is raised and a line on stderr says so. Python sees signals in its main thread only: a program
+whose blocks run in other threads has to end these itself on SIGTERM.
 
 Needs Python 3.9 or newer, nothing but its standard library, and the program `adb`. The phone needs
 `bex-wifi-client`, whose README says what its exit codes mean; here each is an exception.

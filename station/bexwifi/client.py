@@ -42,18 +42,17 @@ class Client:
     def _run(self, read, *words, timeout=None, accepted=(0,)):
         """What `read` makes of the object that the client prints."""
         timeout = timeout or self.timeout
-        output = self.adb.shell(PROGRAM, "--json", "--timeout", f"{timeout:g}", *words, timeout=timeout)
+        output = self.adb.shell(PROGRAM, "--json", "--timeout", f"{timeout:.3f}", *words, timeout=timeout)
         try:
             members = json.loads(output.stdout)
         except ValueError:
-            raise self._silence(output) from None
+            raise self._silence(output, words) from None
         try:
             if members["schema_version"] != answers.SCHEMA_VERSION:
                 raise ValueError(f"schema version {members['schema_version']}")
             answer = read(members)
         except (AttributeError, KeyError, TypeError, ValueError) as error:
-            raise WrongClient(self.serial, f"its {PROGRAM} is of another version than this kit, which "
-                                           f"does not understand its answer: {error}") from error
+            raise self._wrong_client(f"{words[0]}: {error}") from error
         code = members.get("exit_code", 0)
         LOG.debug("phone %s: %s: exit code %d", self.serial, " ".join(words), code)
         if code in accepted:
@@ -61,13 +60,18 @@ class Client:
         kind = OF_EXIT_CODE.get(code, BexWifiError)
         raise kind(self.serial, members.get("error", f"exit code {code}"), answer)
 
-    def _silence(self, output):
+    def _silence(self, output, words):
         """The exception for a run without an object."""
         said = output.stderr.strip().splitlines() or [""]
         if output.code in (126, 127):
             return NoClient(self.serial, f"{PROGRAM} cannot be run: {said[-1]}")
-        own = [line for line in said if line.startswith(f"{PROGRAM}: ")]
+        own = [line.partition(": ")[2] for line in said if line.startswith(f"{PROGRAM}: ")]
+        if own and output.code == 2 and words[0] in ("list", "stop", "doctor"):
+            return self._wrong_client(own[-1])
         if own and output.code in OF_EXIT_CODE:
-            return OF_EXIT_CODE[output.code](self.serial, own[-1].partition(": ")[2])
+            return OF_EXIT_CODE[output.code](self.serial, own[-1])
         reason = said[-1] or f"adb ended with {output.code} and printed nothing"
         return NoAnswer(self.serial, f"no answer: {reason}")
+
+    def _wrong_client(self, why):
+        return WrongClient(self.serial, f"its {PROGRAM} is of another version than this kit: {why}")

@@ -69,9 +69,7 @@ class Phone:
         """Ends whatever the radio does and returns a StopAnswer: the radio is proven off. Waits for calls
         that still run. CommandFailed: it is not proven."""
         with self.lock:
-            answer = self.client.stop()
-            self.lock.started = ""
-            return answer
+            return radio.stop(self)
 
     def doctor(self):
         """What keeps the service from working: a Doctor. Changes nothing."""

@@ -45,6 +45,14 @@ def kind_of(method):
     return next((kind for kind in KINDS if re.fullmatch(kind.starts, method)), None)
 
 
+def stop(phone):
+    """Calls `stop` once, for who holds the lock."""
+    phone.lock.started = phone.lock.started or "stop"  # its calls go on when it is interrupted
+    answer = phone.client.stop()
+    phone.lock.started = ""
+    return answer
+
+
 @signals.undisturbed
 def switch_off(phone):
     """Runs `stop` until the radio is proven off; waits for a phone that has gone. Otherwise raises
@@ -53,8 +61,7 @@ def switch_off(phone):
     stops = STOPS
     while True:
         try:
-            phone.client.stop()
-            phone.lock.started = ""
+            stop(phone)
             return
         except AdbFailed as error:  # nothing was called
             last, more = error, time.monotonic() < deadline
@@ -138,6 +145,7 @@ class Use:
     @signals.holds
     def __enter__(self):
         lock = self._phone.lock.__enter__()
+        self.started = self.ended = None
         try:
             self.started = start(self._phone, self._method, self._arguments)
             lock.user = self._method

@@ -3,12 +3,17 @@
 """What the kit tells of wrong input and of phones that cannot be used: one clear line, the right exception."""
 
 import contextlib
+import json
+import os
+import pathlib
+import pickle
 import socket
 import threading
 
 import pytest
 
 import bexwifi
+from bexwifi.adb import Adb, Output
 from support.adbpeer import message
 from support.kit import TRANSMISSION, raises
 from support.phone import CLIENT
@@ -94,16 +99,65 @@ def test_a_phone_without_the_client_or_the_service(own):
     assert problem.status == "problem" and problem.found and problem.remedy
 
 
+@pytest.fixture(name="prints")
+def prints_fixture(monkeypatch):
+    """A phone whose commands print a text on stdout, another on stderr, and end with a code."""
+    def prints(out, err="", code=0):
+        monkeypatch.setattr(Adb, "run", lambda *_, **__: Output(code, out, err))
+        return bexwifi.Phone("printing")
+
+    return prints
+
+
 @pytest.mark.parametrize("printed, words", [
     ("""{"schema_version":2,"methods":[]}""", "schema version 2"),
     ("""{"schema_version":1}""", "methods"),
     ("""{"schema_version":1,"methods":[{"name":"RunTxStop"}]}""", "summary"),
     ("[]", "another version"), ("7", "another version")])
-def test_a_client_of_another_version(own, printed, words):
-    (own.root / CLIENT[1:]).unlink()
-    (own.root / CLIENT[1:]).write_text(f"#!/system/bin/sh\necho '{printed}'\n")
-    (own.root / CLIENT[1:]).chmod(0o755)
-    raises(bexwifi.WrongClient, words, bexwifi.Phone(own.serial).transmit, *TRANSMISSION)
+def test_a_client_of_another_version(prints, printed, words):
+    raises(bexwifi.WrongClient, words, prints(printed).transmit, *TRANSMISSION)
+
+
+def test_a_client_that_is_too_old(prints):
+    phone = prints("", "bex-wifi-client: unknown method \"stop\"; see bex-wifi-client --help\n", 2)
+    for function in phone.stop, phone.doctor, lambda: phone.methods:
+        raises(bexwifi.WrongClient, "another version than this kit: unknown method", function)
+
+
+OBJECT = {"schema_version": 1, "method": "RunTxStop", "arguments": {"channel": "6"}, "value": None,
+          "radio_may_be_on": None, "stage": "call", "started_at": "2026-11-22T09:15:00.250Z",
+          "duration_ms": 12.5, "client_version": "0.2.0", "error": "what went wrong"}
+
+
+@pytest.mark.parametrize("code, kind", [
+    (1, "CommandFailed"), (2, "WrongUsage"), (3, "NoService"), (4, "TransportFailed"),
+    (5, "DeadlinePassed"), (6, "NotWritten"), (7, "NoCount"), (130, "Interrupted"), (143, "Interrupted"),
+    (99, "BexWifiError")])
+def test_each_exit_code_has_an_exception(prints, code, kind):
+    phone = prints(json.dumps({**OBJECT, "exit_code": code}), "bex-wifi-client: what went wrong\n", code)
+    failed = raises(getattr(bexwifi, kind), "what went wrong", phone.client.call, "RunTxStop", {"channel": "6"})
+    assert (failed.words, failed.answer.exit_code) == ("what went wrong", code)
+    assert (failed.answer.duration, failed.may_go_on) == (0.0125, True)
+    copy = pickle.loads(pickle.dumps(failed))  # as between the processes of a station
+    assert (str(copy), copy.answer) == (str(failed), failed.answer)
+
+
+@pytest.mark.parametrize("code, err, words", [
+    (0, "", "adb ended with 0 and printed nothing"), (137, "", "adb ended with 137"),
+    (1, "error: closed\n", "error: closed"), (0, "bex-wifi-client: warning: channel 999\n", "channel 999")])
+def test_no_answer_is_not_success(prints, code, err, words):
+    failed = raises(bexwifi.NoAnswer, words, prints("", err, code).client.call, "RunTxStop", {})
+    assert failed.may_go_on
+
+
+def test_an_adb_that_hangs_is_ended(tmp_path, monkeypatch):
+    (tmp_path / "adb").write_text(f"#!/bin/sh\necho $$ >{tmp_path}/pid\nexec sleep 1000\n")
+    (tmp_path / "adb").chmod(0o755)
+    monkeypatch.setenv("PATH", f"{tmp_path}:{os.environ['PATH']}")
+    monkeypatch.setattr(bexwifi.adb, "ADB_TIMEOUT", 0)
+    raises(bexwifi.NoAnswer, "adb did not end within 1 seconds", bexwifi.Phone("hangs", timeout=1).doctor)
+    started = tmp_path / "pid"  # on a busy machine it may not have come to writing it
+    assert not (started.exists() and pathlib.Path("/proc", started.read_text().strip() or "none").exists())
 
 
 @pytest.mark.parametrize("arguments", [
