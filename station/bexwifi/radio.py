@@ -96,7 +96,7 @@ def call(phone, method, arguments):
         answer = phone.client.call(method, arguments)
     except BaseException as error:
         if not isinstance(error, BexWifiError) or error.may_go_on:
-            lock.started = lock.started or method  # a start must wait for its end
+            lock.started = method  # only `stop` waits for its end
         raise
     kind = kind_of(lock.started)
     if kind and kind.proof == method:
@@ -179,7 +179,7 @@ class Use:
             self.ended = self._phone.client.call(end, {name: self._arguments[name] for name in names})
         except BexWifiError as failure:
             problem = failure
-        if problem is None and self._kind.proof:
+        if problem is None and self._kind.proof and self._phone.lock.started == self._method:
             self._phone.lock.started = ""
             return
         if not switch_off_after(self._phone, error) or problem is None:

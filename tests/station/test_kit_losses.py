@@ -13,6 +13,7 @@ import pytest
 
 import bexwifi
 from bexwifi import radio
+from bexwifi.adb import Adb, Output
 from support.adb import TIMEOUT, held
 from support.kit import TRANSMISSION, is_marked, raises
 from support.radio import radio_use
@@ -165,10 +166,11 @@ def test_a_phone_that_comes_back(own, unplugged, at_the_first_pause, body):
     block, plug = unplugged
     at_the_first_pause(plug)
     if body:
-        with pytest.warns(bexwifi.EndedByStop, match="adb does not know it"):
+        with pytest.warns(bexwifi.EndedByStop, match=f"phone {own.serial}: .*the radio is off"):
             assert not block.__exit__(type(body), body, None)
     else:
-        raises(bexwifi.UnknownPhone, "adb does not know it", block.__exit__, None, None, None)
+        with pytest.raises((bexwifi.AdbFailed, bexwifi.NoAnswer)):  # whether adb has noticed it or not
+            block.__exit__(None, None, None)
     works(bexwifi.Phone(own.serial), own)
 
 
@@ -243,6 +245,17 @@ def test_an_exception_passes_a_block(phone, simulated):
 def test_nothing_is_started_twice(phone, simulated):
     phone.call(*TRANSMISSION)
     ends_and_starts(phone, simulated)
+
+
+def test_a_call_that_may_go_on_is_waited_for_at_the_end_of_its_block(phone, simulated, monkeypatch):
+    with phone.transmit(*TRANSMISSION):
+        with monkeypatch.context() as cut:
+            cut.setattr(Adb, "run", lambda *_, **__: Output(0, "", ""))
+            raises(bexwifi.NoAnswer, "no answer", phone.call, "RunTxStop", 6)
+        since = simulated.log.stat().st_size
+    stop = simulated.explain("snifferStop")
+    assert [line for line, _ in simulated.commands(since)][-len(stop):] == stop
+    works(phone, simulated)
 
 
 def test_one_radio_has_one_use(phone, simulated):
