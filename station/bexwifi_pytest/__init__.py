@@ -10,7 +10,10 @@ the phones go in parallel, and each has one test at a time. The fixture `measure
     measure("packets", 948, unit="packets", low=950, high=1000)
     measure("packets", 948, unit="packets", low=950, at={"channel": 6, "rate": 54})
 
-The test goes on; at its end it fails, telling each limit that was missed. The limits themselves are good.
+A value is a number, a boolean or a text; a number may have limits, which are good values themselves. The
+test goes on after a missed limit, and fails at its end with a line for each. `measure` returns whether the
+limits were kept.
+
 A measurement with `at` is a point of a sweep: the page has a chart of each sweep, over the first key of
 `at`, with a line for each value of the others.
 
@@ -37,6 +40,10 @@ from .servicelog import ServiceLog
 MEASUREMENTS = pytest.StashKey()
 LOG = pytest.StashKey()
 INTERRUPTS = pytest.StashKey()
+
+
+class LimitsMissed(pytest.fail.Exception):
+    """Fails a test that has come to its end."""
 
 
 def pytest_addoption(parser):
@@ -151,7 +158,7 @@ def pytest_runtest_call(item):
     """After a test that has come to its end."""
     missed = missed_by(item)
     if missed:
-        pytest.fail("\n".join(missed), pytrace=False)
+        raise LimitsMissed("\n".join(missed), pytrace=False)
 
 
 def missed_by(item):
@@ -163,7 +170,7 @@ def pytest_runtest_makereport(item, call):
     report = (yield).get_result()
     if report.failed:
         missed = missed_by(item)
-        if missed and call.when == "call" and not call.excinfo.errisinstance(pytest.fail.Exception):
+        if missed and call.when == "call" and not call.excinfo.errisinstance(LimitsMissed):
             report.sections.append(("Limits that were missed", "\n".join(missed)))
         lines = item.stash[LOG].lines() if LOG in item.stash else []
         if lines:

@@ -85,9 +85,11 @@ class Collector:
 
 
 def fail(result, report):
-    text = printable(report.longreprtext).strip()
+    text = printable(report.longrepr).strip()  # longreprtext begins with the worker
     crash = getattr(report.longrepr, "reprcrash", None)
-    line = printable(crash.message).strip().partition("\n")[0] if crash else text.rpartition("\n")[2]
+    lines = (printable(crash.message).strip() if crash else text).split("\n")
+    # Of a plan that cannot be read the exception comes last.
+    line = lines[-1 if report.when == "collect" and not crash else 0]
     result.outcome = "failed"
     result.failures.append(Failure(line, text))
 

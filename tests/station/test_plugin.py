@@ -139,11 +139,12 @@ def test_other(phone):
 def test_limit(phone, measure):
     log(phone, "wl up")
     measure("packets", 5, low=6)
+    measure("loss", 5, high=1)
     log(phone, "wl <down>")
 
 def test_both(phone, measure):
     measure("packets", 7, high=6)
-    assert phone is None
+    pytest.fail("given up")
 """, phones=["R1"])
     section = "*The service's command lines*"
     done.stdout.fnmatch_lines([
@@ -152,7 +153,11 @@ def test_both(phone, measure):
         "packets: 7 is above 6"])
     for other in "another test", "before":
         done.stdout.no_fnmatch_line(f"*cmd: *{other}*")
+    assert [row[1:] for row in outcomes(station)] == [
+        ("plan.py::test_both", "failed", "Failed: given up"),
+        ("plan.py::test_limit", "failed", "packets: 5 is below 6"), ("plan.py::test_other", "passed", "")]
     page = text_of(station, "report.html")
+    assert "loss: 5 is above 1" in page
     assert "wl &lt;down&gt;" in page
     assert "another test" not in page
 
