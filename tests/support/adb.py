@@ -64,7 +64,10 @@ class AdbPhone(Phone):
     def up(self, *port):
         up = subprocess.run([PHONE, "up", self.folder, "--adb", *port], check=True, timeout=TIMEOUT,
                             stdout=subprocess.PIPE, text=True)
+        new = self.serial is None
         self.serial = up.stdout.strip()
+        if new:
+            self.forget_lock()  # an earlier phone at this port may have left one
         wait_for(self.connects)
 
     def connects(self):
@@ -76,6 +79,11 @@ class AdbPhone(Phone):
         """Makes the server give up a phone that has gone."""
         if self.serial:
             self.adb("disconnect", self.serial)
+
+    def forget_lock(self):
+        """Removes the lock file that the programs of a station share."""
+        if self.serial:
+            pathlib.Path(f"/tmp/bex-{self.serial}.lock").unlink(missing_ok=True)
 
     def down(self):
         super().down()
@@ -115,6 +123,7 @@ def made_phone(adb, chip):
             yield phone
         finally:
             phone.down()
+            phone.forget_lock()
 
 
 @pytest.fixture(scope="session", name="phone")
