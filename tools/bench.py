@@ -9,6 +9,7 @@ usage: bench.py BUILD [--short | --smoke | --write]
 import argparse
 import datetime
 import json
+import math
 import os
 import pathlib
 import platform
@@ -19,7 +20,8 @@ import tempfile
 
 import script
 
-DOCUMENT = pathlib.Path(__file__).resolve().parents[1] / "docs/performance.md"
+ROOT = pathlib.Path(__file__).resolve().parents[1]
+DOCUMENT = ROOT / "docs/performance.md"
 MIB = 1024 * 1024
 # Linked into the service besides the generated stubs and the host layer.
 OWN_OBJECTS = ("service/CMakeFiles", "suites/CMakeFiles", "sniffer/CMakeFiles", "shell/CMakeFiles")
@@ -188,6 +190,16 @@ def start(table, build, repetitions, min_time):
                   extra / MIB, " MiB")
 
 
+def station(table, build, repetitions, min_time):
+    calls_of_each = repetitions * math.ceil(min_time / 0.02)
+    found = json.loads(run(["/usr/bin/python3", "-B", ROOT / "benchmarks/station.py", build,
+                            str(calls_of_each), str(min(7, calls_of_each))]))
+    table.at_most("a call through the station kit", "the same adb shell line", 1.1,
+                  found["call"] / found["by hand"])
+    table.recorded(f"the kit's share of the station's processor time, {found['phones']} phones",
+                   "the kit, adb and its server", f"{found['share']:.0%}")
+
+
 def size(table, folder):
     """Code and data of the service's own objects, which are what can grow."""
     objects = [path for part in OWN_OBJECTS for path in (folder / part).rglob("*.o")]
@@ -231,7 +243,7 @@ def main():
         growth(table, found)
     if not arguments.short:
         for part, repetitions, min_time in ((shell, 9, 0.2), (texts, 5, 0.02), (calls, 9, 0.2),
-                                            (start, 9, 0.2)):
+                                            (start, 9, 0.2), (station, 9, 0.2)):
             if arguments.smoke:
                 repetitions, min_time = 2, 0.001
             part(table, build, repetitions, min_time)

@@ -11,7 +11,7 @@ readonly PACKAGE_PACKAGES=(python3 groff-base dpkg-dev file)
 readonly STATION_PACKAGES=(adb python3-pytest python3-pytest-xdist python3-matplotlib python3-jinja2)
 readonly TEST_PACKAGES=("${PACKAGE_PACKAGES[@]}" "${STATION_PACKAGES[@]}" git make python3-lxml
     python3-jsonschema chromium checkpolicy m4 valgrind)
-readonly BENCH_PACKAGES=(python3 valgrind)
+readonly BENCH_PACKAGES=("${PHONE_PACKAGES[@]}" "${STATION_PACKAGES[@]}" valgrind)
 readonly FORMAT_PACKAGES=(git clang-format blueprint-tools)
 readonly CHECK_PACKAGES=("${FORMAT_PACKAGES[@]}" clang clang-tidy shellcheck make python3
     python3-lxml libc++-dev libc++abi-dev googletest)
