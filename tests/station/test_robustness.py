@@ -111,12 +111,17 @@ def whole_run_fixture(phone_of, tmp_path_factory):
 def test_an_interrupt_at_any_moment_leaves_every_radio_off(moment, whole_run, tmp_path):
     phones = list(whole_run)
     watched = phones[moment % len(phones)]
-    lines = command_lines(watched) + whole_run[watched] * moment // SIGNALS
+    before = command_lines(watched)
+    lines = before + whole_run[watched] * moment // SIGNALS
     with plan(phones, tmp_path, f"-n{len(phones)}", *PART) as run:
         wait_in(run, lambda: command_lines(watched) >= lines and "session starts" in output(tmp_path))
         # As Ctrl-C at a terminal does; or as somebody else's kill.
-        (os.killpg if moment % 2 else os.kill)(run.pid, signal.SIGINT)
-        assert run.wait(TIMEOUT) == INTERRUPTED, output(tmp_path)
+        with contextlib.suppress(ProcessLookupError):
+            (os.killpg if moment % 2 else os.kill)(run.pid, signal.SIGINT)
+        code = run.wait(TIMEOUT)
+    # On a busy machine the plan may be over before this test sees that the moment has come.
+    over = command_lines(watched) - before == whole_run[watched]
+    assert code == INTERRUPTED or (code == 0 and over), output(tmp_path)
     assert "MAY BE ON" not in output(tmp_path)
     leaves_nothing(run, phones)
 
@@ -129,8 +134,8 @@ def test_a_loss_in_the_middle_is_told_and_the_next_test_works(how, told, adb, ph
     losses = {"adb's server is killed": lambda: adb("kill-server"),
               "the connection is cut": phone.forget,
               "the service is killed": lambda: phone.phone("restart-service", phone.folder)}
-    # The server has the connections of all phones.
-    phones = [phone] if how == "adb's server is killed" else [phone, other]
+    # One way is enough to see that other phones do not notice.
+    phones = [phone, other] if how == "the service is killed" else [phone]
     waiting = phone.root / "phone/faults/wl.waiting"
     phone.fault("wl", "--when", "pkteng_start*", "wait")
     with plan(phones, tmp_path, f"-n{len(phones)}", "-k", "11b or monitor") as run:
