@@ -12,7 +12,7 @@ import subprocess
 import pytest
 
 from support.phone import CHIPS, ROOT
-from support.waiting import wait_for
+from support.waiting import wait_during
 
 TIMEOUT = 600
 PLAN = """
@@ -54,7 +54,7 @@ def leaves_nothing(folder, serials, words):
 
 
 def test_the_example_passes_on_every_phone(station, tmp_path):
-    with station("-k", "identity") as run:
+    with station("-k", "identity", "-n", "2") as run:
         out, complaints = run.communicate(timeout=TIMEOUT)
     assert run.returncode == 0, out + complaints
     up = re.findall(r"^dev: the (\S+) phone is up: (\S+)$", complaints, re.M)
@@ -72,7 +72,7 @@ def test_ctrl_c_leaves_a_report_and_nothing_else(station, tmp_path):
     with station("my_plan.py") as run:
         while f"the {CHIPS[-1]} phone is up" not in run.stderr.readline():
             assert run.poll() is None
-        wait_for(lambda: len(list(tmp_path.glob("*.on"))) == len(CHIPS) or run.poll() is not None)
+        wait_during(run, lambda: len(list(tmp_path.glob("*.on"))) == len(CHIPS))
         os.killpg(run.pid, signal.SIGINT)
         out, complaints = run.communicate(timeout=TIMEOUT)
     assert run.returncode == 130, out + complaints

@@ -14,7 +14,6 @@ import pathlib
 import signal
 import subprocess
 import sys
-import time
 import xml.etree.ElementTree as ET
 
 import pytest
@@ -22,7 +21,7 @@ import pytest
 from support.adb import processes_of
 from support.phone import ROOT
 from support.radio import radio_use
-from support.waiting import wait_for
+from support.waiting import wait_during, wait_for
 
 PART = [] if "BEX_STATION_SIGNALS" in os.environ else ["-k", "802.11b or 802.11n or monitor"]
 SIGNALS = int(os.environ.get("BEX_STATION_SIGNALS", "3"))
@@ -81,12 +80,6 @@ def leaves_nothing(run, phones):
             assert lock.read() == ""
 
 
-def wait_in(run, condition):
-    """Waits, however slow the machine is, until the run is so far, or has ended."""
-    while run.poll() is None and not condition():
-        time.sleep(0.005)
-
-
 def command_lines(phone):
     return phone.log.read_bytes().count(b"cmd: ")
 
@@ -114,7 +107,7 @@ def test_an_interrupt_at_any_moment_leaves_every_radio_off(moment, whole_run, tm
     before = command_lines(watched)
     lines = before + whole_run[watched] * moment // SIGNALS
     with plan(phones, tmp_path, f"-n{len(phones)}", *PART) as run:
-        wait_in(run, lambda: command_lines(watched) >= lines and "session starts" in output(tmp_path))
+        wait_during(run, lambda: command_lines(watched) >= lines and "session starts" in output(tmp_path))
         # As Ctrl-C at a terminal does; or as somebody else's kill.
         with contextlib.suppress(ProcessLookupError):
             (os.killpg if moment % 2 else os.kill)(run.pid, signal.SIGINT)
@@ -139,7 +132,7 @@ def test_a_loss_in_the_middle_is_told_and_the_next_test_works(how, told, adb, ph
     waiting = phone.root / "phone/faults/wl.waiting"
     phone.fault("wl", "--when", "pkteng_start*", "wait")
     with plan(phones, tmp_path, f"-n{len(phones)}", "-k", "11b or monitor") as run:
-        wait_in(run, waiting.exists)
+        wait_during(run, waiting.exists)
         losses[how]()
         phone.fault("wl", "clear")
         code = run.wait(TIMEOUT)

@@ -11,3 +11,9 @@ def wait_for(condition):
     while not condition():
         assert time.monotonic() < deadline, "the condition never came true"
         time.sleep(0.005)
+
+
+def wait_during(run, condition):
+    """Waits, however slow the machine is, until the condition is true or the process has ended."""
+    while run.poll() is None and not condition():
+        time.sleep(0.005)
