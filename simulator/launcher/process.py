@@ -186,7 +186,9 @@ class Sandbox:
             return
         # A child of bwrap leads it, whose number is its own for as long as bwrap cannot reap it.
         os.kill(self.pid, signal.SIGSTOP)
-        os.waitid(os.P_PID, self.pid, os.WSTOPPED | os.WEXITED | os.WNOWAIT)
+        state = os.waitid(os.P_PID, self.pid, os.WSTOPPED | os.WEXITED | os.WNOWAIT)
+        if state.si_code != os.CLD_STOPPED:
+            return  # the command has ended
         reached = False
         for child in _children(self.pid):
             try:

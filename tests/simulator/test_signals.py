@@ -7,6 +7,7 @@ import contextlib
 import fcntl
 import os
 import pathlib
+import re
 import pty
 import select
 import signal
@@ -138,6 +139,30 @@ def test_a_command_that_ignores_the_key_goes_on(any_new_phone):
         os.write(terminal, b"\x03")
         os.write(terminal, b"alive\n")
         await_word(terminal, "alive")
+        assert launcher.wait(60) == 4
+
+
+def pending(pid, number):
+    """Whether a signal waits for a process."""
+    status = pathlib.Path(f"/proc/{pid}/status").read_text()
+    return int(re.search(r"^ShdPnd:\s*(\w+)", status, re.M)[1], 16) >> number - 1 & 1
+
+
+def children(pid):
+    return [int(child) for child in pathlib.Path(f"/proc/{pid}/task/{pid}/children").read_text().split()]
+
+
+def test_a_key_after_the_command_has_ended_changes_nothing(any_new_phone):
+    with at_terminal(any_new_phone, "echo ready; read word; exit 4") as (launcher, terminal):
+        await_word(terminal, "ready")
+        holder, = children(launcher.pid)
+        sandbox, = children(holder)
+        os.kill(holder, signal.SIGSTOP)
+        os.write(terminal, b"over\n")
+        wait_for(lambda: stat(sandbox)[0] == "Z")
+        os.write(terminal, b"\x03")
+        wait_for(lambda: pending(holder, signal.SIGINT))
+        os.kill(holder, signal.SIGCONT)
         assert launcher.wait(60) == 4
 
 
