@@ -59,7 +59,7 @@ void count(const std::string& name, const std::function<void()>& work) {
 } // namespace
 
 // The linker leads the service's calls of these functions here, under its own kind of names. The
-// log is dropped. NOLINTBEGIN(bugprone-reserved-identifier)
+// log is dropped. NOLINTBEGIN(clang-diagnostic-reserved-identifier)
 extern "C" {
 
 FILE* __real_popen(const char* line, const char* mode);
@@ -86,7 +86,7 @@ int __wrap___android_log_print(int, const char*, const char*, ...) {
     return 0;
 }
 }
-// NOLINTEND(bugprone-reserved-identifier)
+// NOLINTEND(clang-diagnostic-reserved-identifier)
 
 namespace {
 

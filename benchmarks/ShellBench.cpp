@@ -41,7 +41,7 @@ int gLines = 0;
 } // namespace
 
 // The linker leads all calls of these functions in this program here, under its own kind of names.
-// NOLINTBEGIN(bugprone-reserved-identifier)
+// NOLINTBEGIN(clang-diagnostic-reserved-identifier)
 extern "C" {
 FILE* __real_popen(const char* line, const char* mode);
 int __real_pclose(FILE* stream);
@@ -60,7 +60,7 @@ char* __wrap_fgets(char* piece, int size, FILE* stream) {
     return gNoShell ? nullptr : __real_fgets(piece, size, stream);
 }
 }
-// NOLINTEND(bugprone-reserved-identifier)
+// NOLINTEND(clang-diagnostic-reserved-identifier)
 
 namespace {
 
