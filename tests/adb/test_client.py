@@ -112,7 +112,7 @@ def test_only_a_terminal_shows_how_long_a_call_takes(phone, hold):
 
 
 def test_the_lock_keeps_calls_apart_and_passes_the_exit_code_on(phone, hold, tmp_path):
-    lock = block_with("flock").replace("/tmp/", f"{tmp_path}/")
+    lock = block_with("flock").replace("/tmp/", f"{shlex.quote(str(tmp_path))}/")
     wait_until_waiting, release = hold("wl")
     since = phone.log.stat().st_size
     with run_block(phone, lock, tmp_path) as one, run_block(phone, lock, tmp_path) as other:

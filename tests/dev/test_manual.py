@@ -6,6 +6,7 @@ import json
 import os
 import pathlib
 import re
+import shlex
 import subprocess
 
 import pytest
@@ -54,7 +55,7 @@ def completion_of_a_line(tmp_path_factory):
         """What bash offers for the last word."""
         line = " ".join(f"'{word}'" for word in ("bex-wifi-client", *words))
         return printed("bash", "--norc", "-euc", f"""
-            source {script}
+            source {shlex.quote(str(script))}
             COMP_WORDS=({line}) COMP_CWORD={len(words)}
             _bex_wifi_client
             printf '%s\\n' "${{COMPREPLY[@]}}\"""").stdout.split()

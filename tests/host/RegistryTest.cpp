@@ -145,7 +145,7 @@ TEST_F(RegistryTest, GetServiceWaitsForADeclaredName) {
     const std::string log = root() + "/log";
     ASSERT_EQ(mkfifo(log.c_str(), 0600), 0);
     std::string command = "exec";
-    for (const std::string& word : kServerCommand) command += " " + word;
+    for (const std::string& word : kServerCommand) command += " '" + word + "'";
     command += " 1 0 0 call found 2>" + log;
     FILE* client = popen(command.c_str(), "re");
     ASSERT_NE(client, nullptr);

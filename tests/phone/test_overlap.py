@@ -94,7 +94,7 @@ def locked_line(phone, folder, call):
     lock, shell = "/tmp/bex-$SERIAL.lock", "adb -s $SERIAL shell"
     assert lock in example and shell in example and example.endswith(" RunTxStop 6")
     inside = " ".join(shlex.quote(str(word)) for word in phone.command())
-    return example.replace(lock, f"{folder}/lock").replace(shell, inside) \
+    return example.replace(lock, shlex.quote(f"{folder}/lock")).replace(shell, inside) \
         .replace("RunTxStop 6", " ".join(call))
 
 
