@@ -106,8 +106,20 @@ def _course(members):
             "started_at": started_at.replace(tzinfo=datetime.timezone.utc)}
 
 
+def exit_code(members):
+    """The client's exit code; `list` has none."""
+    return _whole(members.get("exit_code", 0))
+
+
+def _whole(number):
+    if type(number) is not int:  # a bool is an int, too
+        raise TypeError(f"{number!r} is no whole number")
+    return number
+
+
 def answer(members):
-    return _picked(Answer, {**_course(members), "count": members.get("count"),
+    count = members.get("count")
+    return _picked(Answer, {**_course(members), "count": count if count is None else _whole(count),
                             "warnings": tuple(members.get("warnings", ()))})
 
 

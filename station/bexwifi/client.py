@@ -45,15 +45,15 @@ class Client:
         output = self.adb.shell(PROGRAM, "--json", "--timeout", f"{timeout:.3f}", *words, timeout=timeout)
         try:
             members = json.loads(output.stdout)
-        except ValueError:
+        except (ValueError, RecursionError):
             raise self._silence(output, words) from None
         try:
             if members["schema_version"] != answers.SCHEMA_VERSION:
                 raise ValueError(f"schema version {members['schema_version']}")
+            code = answers.exit_code(members)
             answer = read(members)
-        except (AttributeError, KeyError, TypeError, ValueError) as error:
+        except (AttributeError, KeyError, OverflowError, TypeError, ValueError) as error:
             raise self._wrong_client(f"{words[0]}: {error}") from error
-        code = members.get("exit_code", 0)
         LOG.debug("phone %s: %s: exit code %d", self.serial, " ".join(words), code)
         if code in accepted:
             return answer
@@ -70,7 +70,8 @@ class Client:
             return self._wrong_client(own[-1])
         if own and output.code in OF_EXIT_CODE:
             return OF_EXIT_CODE[output.code](self.serial, own[-1])
-        reason = said[-1] or f"adb ended with {output.code} and printed nothing"
+        printed = "what is not JSON" if output.stdout else "nothing"
+        reason = said[-1] or f"adb ended with {output.code} and printed {printed}"
         return NoAnswer(self.serial, f"no answer: {reason}")
 
     def _wrong_client(self, why):

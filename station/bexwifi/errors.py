@@ -20,7 +20,7 @@ class BexWifiError(Exception):
     def __init__(self, serial, words, answer=None):
         super().__init__(serial, words, answer)
         self.serial = serial
-        self.words = words
+        self.words = " ".join(str(words).splitlines())
         self.answer = answer
 
     def __str__(self):

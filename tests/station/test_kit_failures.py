@@ -15,8 +15,9 @@ import pytest
 import bexwifi
 from bexwifi.adb import Adb, Output
 from support.adbpeer import message
-from support.kit import TRANSMISSION, raises
+from support.kit import TRANSMISSION, is_marked, raises
 from support.phone import CLIENT
+from support.radio import radio_use
 
 
 @pytest.fixture(name="device")
@@ -113,7 +114,7 @@ def prints_fixture(monkeypatch):
     ("""{"schema_version":2,"methods":[]}""", "schema version 2"),
     ("""{"schema_version":1}""", "methods"),
     ("""{"schema_version":1,"methods":[{"name":"RunTxStop"}]}""", "summary"),
-    ("[]", "another version"), ("7", "another version")])
+    ("[]", "another version"), ("7", "another version"), ('{"schema_version":"2\\n3"}', "version 2 3")])
 def test_a_client_of_another_version(prints, printed, words):
     raises(bexwifi.WrongClient, words, prints(printed).transmit, *TRANSMISSION)
 
@@ -140,6 +141,32 @@ def test_each_exit_code_has_an_exception(prints, code, kind):
     assert (failed.answer.duration, failed.may_go_on) == (0.0125, True)
     copy = pickle.loads(pickle.dumps(failed))  # as between the processes of a station
     assert (str(copy), copy.answer) == (str(failed), failed.answer)
+
+
+@pytest.mark.parametrize("odd", [
+    {"exit_code": []}, {"exit_code": True}, {"exit_code": "0"}, {"exit_code": None}, {"count": "5"},
+    {"duration_ms": 10 ** 400}, {"started_at": 0}, {"stage": ...}, {"arguments": ...}])
+def test_an_answer_of_other_types(prints, odd):
+    members = {name: value for name, value in {**OBJECT, "exit_code": 0, **odd}.items() if value is not ...}
+    phone = prints(json.dumps(members))
+    raises(bexwifi.WrongClient, "another version", phone.client.call, "RunTxStop", {"channel": "6"})
+
+
+@pytest.mark.parametrize("printed", [
+    "[" * 100_000, json.dumps({**OBJECT, "exit_code": []})], ids=["deep", "other types"])
+def test_the_radio_is_off_whatever_its_end_answers(phone, simulated, monkeypatch, printed):
+    run = Adb.run
+
+    def replaced(adb, *arguments, **options):
+        if "RunTxStop" in arguments[1]:
+            return Output(0, printed, "")  # and nothing was called
+        return run(adb, *arguments, **options)
+
+    monkeypatch.setattr(Adb, "run", replaced)
+    with pytest.raises((bexwifi.NoAnswer, bexwifi.WrongClient)), phone.transmit(*TRANSMISSION):
+        pass
+    assert not is_marked(phone)
+    assert radio_use(simulated) == "idle"
 
 
 @pytest.mark.parametrize("code, err, words", [
