@@ -22,14 +22,17 @@ def html(run):
 
 
 def charts(results, prefix):
-    """(title, SVG) of each sweep that has a number to show; a title alone where matplotlib is missing."""
+    """(title, SVG, why there is none) of each sweep that has a number to show."""
     drawn = [Chart(name, measurements) for name, measurements in results.sweeps.items()]
-    return [(chart.title, svg_of(chart, f"{prefix}-{index}-"))
+    return [(chart.title, *svg_of(chart, f"{prefix}-{index}-"))
             for index, chart in enumerate(drawn) if chart.lines]
 
 
 def svg_of(chart, prefix):
+    """Whatever matplotlib cannot draw, the rest of the report is worth having."""
     try:
-        return chart.svg(prefix)
+        return chart.svg(prefix), ""
     except ImportError:
-        return ""
+        return "", "python3-matplotlib is not installed"
+    except Exception as error:  # pylint: disable=broad-exception-caught
+        return "", f"matplotlib cannot draw it: {error}"

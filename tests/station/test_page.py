@@ -105,6 +105,16 @@ def test_a_station_without_matplotlib_has_a_page(monkeypatch):
     assert "<svg" not in text
 
 
+@pytest.mark.filterwarnings("ignore:overflow:RuntimeWarning")
+def test_a_sweep_that_cannot_be_drawn_leaves_the_page():
+    run = Run(["R1"])
+    run.results.append(Result("R1", "a", "passed", measurements=[
+        Measurement.of("power", value, at={"channel": 6}) for value in (1e308, -1e308)]))
+    text = page.html(run)
+    assert "No chart: matplotlib cannot draw it: " in text
+    assert "1e+308" in text
+
+
 def test_the_command_lines_behind_a_failure(shown):
     lines = "[...document.querySelectorAll('#phone-1 .failure li')].map(each => each.textContent)"
     assert [line.partition(" cmd")[1:] for line in shown.evaluate(lines)] == [
