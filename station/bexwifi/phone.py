@@ -2,17 +2,23 @@
 # SPDX-License-Identifier: Apache-2.0
 """A phone, and the calls to its service."""
 
+import numbers
+
 from bexwifi import radio
 from bexwifi.client import Client
 from bexwifi.errors import WrongUsage
 from bexwifi.lock import PhoneLock
+
+# In seconds. The client takes no more, and the kit gives it three decimals.
+LEAST_TIMEOUT = 0.001
+MOST_TIMEOUT = 1_000_000
 
 
 class Phone:
     """A phone on adb.
 
     serial: as `adb devices` shows it
-    timeout: seconds that a call takes at most. The wait for the phone's lock does not count.
+    timeout: seconds that a call takes at most, up to 1,000,000. The wait for the phone's lock does not count.
     lock: a context manager that keeps other programs away. Every call takes it; take it yourself where
         nobody may come between several calls.
     client: the same calls without lock and care; client.adb runs other commands
@@ -23,11 +29,9 @@ class Phone:
     def __init__(self, serial, timeout=60):
         if not serial or not isinstance(serial, str):
             raise ValueError(f"a serial number is a text such as adb devices shows, not {serial!r}")
-        if not timeout > 0:
-            raise ValueError(f"a timeout is a number of seconds above 0, not {timeout!r}")
         self.serial = serial
         self.lock = PhoneLock.of(serial)
-        self.client = Client(serial, timeout)
+        self.client = Client(serial, _checked(timeout))
         self._methods = None
 
     @property
@@ -36,7 +40,7 @@ class Phone:
 
     @timeout.setter
     def timeout(self, seconds):
-        self.client.timeout = seconds
+        self.client.timeout = _checked(seconds)
 
     def __repr__(self):
         return f"Phone({self.serial!r})"
@@ -109,3 +113,10 @@ class Phone:
         texts = {name: str(given[name]) for name in names}
         return {name: text.lower() if isinstance(given[name], bool) else text
                 for name, text in texts.items()}
+
+
+def _checked(timeout):
+    if not isinstance(timeout, numbers.Real) or not LEAST_TIMEOUT <= timeout <= MOST_TIMEOUT:
+        raise ValueError(f"a timeout is a number of seconds from {LEAST_TIMEOUT} to {MOST_TIMEOUT},"
+                         f" not {timeout!r}")
+    return float(timeout)

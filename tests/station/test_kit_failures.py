@@ -72,10 +72,14 @@ def test_what_is_no_serial_number(serial):
         bexwifi.Phone(serial)
 
 
-@pytest.mark.parametrize("timeout", [0, -1, float("nan")])
+@pytest.mark.parametrize("timeout", [0, -1, 1e-9, float("nan"), float("inf"), 1e7, "5", None])
 def test_what_is_no_timeout(timeout):
-    with pytest.raises(ValueError, match="seconds above 0"):
+    with pytest.raises(ValueError, match="a timeout is a number of seconds from"):
         bexwifi.Phone("nonesuch", timeout=timeout)
+    phone = bexwifi.Phone("nonesuch", timeout=5)
+    with pytest.raises(ValueError, match="a timeout is a number of seconds from"):
+        phone.timeout = timeout
+    assert phone.timeout == 5
 
 
 def test_a_phone_without_the_client_or_the_service(own):
