@@ -26,6 +26,7 @@ everything in it. A file that cannot be written is told in one line, and pytest 
 
 import pathlib
 import sys
+import tempfile
 
 import pytest
 
@@ -88,6 +89,8 @@ def pytest_sessionstart(session):
     if options.wifi_report:
         try:
             options.wifi_report.mkdir(parents=True, exist_ok=True)
+            with tempfile.TemporaryFile(dir=options.wifi_report):
+                pass  # told now, not after hours
         except OSError as error:
             raise pytest.UsageError(f"--wifi-report {options.wifi_report}: {error.strerror}") from None
         config.pluginmanager.register(

@@ -233,11 +233,18 @@ def test_wrong_usage_is_one_line(station, arguments, phones, message):
     assert (done.ret, [line for line in done.errlines if line]) == (4, [f"ERROR: {message}"])
 
 
+def test_a_report_that_cannot_be_written_is_told_before_the_first_test(station):
+    done = station("def test_a(phone):\n    open('ran', 'w').close()", report="/proc")
+    told, = [line for line in done.errlines if line]
+    assert (done.ret, told.startswith("ERROR: --wifi-report /proc: ")) == (4, True)
+    assert not (station.report.parent / "ran").exists()
+
+
 def test_a_full_disk_leaves_what_was_there(station):
     station.report.mkdir()
     for name in "report.html", "junit.xml":
         (station.report / name).write_text("old")
-    done = station(SWEEP + "    measure('n' * 9000, 5, low=1, high=9)", before="ulimit -f 30;")
+    done = station(SWEEP + "    measure('n' * 9000, 5, low=1, high=9)", before="ulimit -f 24;")
     assert done.ret == 3
     told = [line for line in done.outlines if line.startswith("wifi report: ")]
     assert told == [f"wifi report: cannot write {station.report / name}: File too large"
