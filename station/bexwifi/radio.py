@@ -10,7 +10,7 @@ import warnings
 
 from bexwifi import signals
 from bexwifi.errors import (
-    AdbFailed, BexWifiError, CommandFailed, NoCount, RadioMayBeOn, WrongUsage)
+    AdbFailed, BexWifiError, CommandFailed, NoCount, RadioMayBeOn, WrongClient, WrongUsage)
 
 # How often `stop` is tried, and the seconds in between.
 STOPS = 3
@@ -139,8 +139,17 @@ class Use:
             raise WrongUsage(phone.serial, f"{method} starts no {kind}; there are {', '.join(fitting)}")
         self._method = method
         self._arguments = arguments
+        self._end_arguments = self._arguments_of(self._kind.end)
         self.started = None
         self.ended = None
+
+    def _arguments_of(self, end):
+        """The start's arguments that the end takes, too."""
+        try:
+            return {each.name: self._arguments[each.name] for each in self._phone.methods[end].arguments}
+        except KeyError as error:
+            words = f"{self._method} cannot be ended by {end}: there is no {error}"
+            raise WrongClient(self._phone.serial, words) from None
 
     @signals.holds
     def __enter__(self):
@@ -173,10 +182,9 @@ class Use:
 
     def _end(self, error):
         """Ends the use. `error` is what the block raised."""
-        end, problem = self._kind.end, None
-        names = [argument.name for argument in self._phone.methods[end].arguments]
+        problem = None
         try:
-            self.ended = self._phone.client.call(end, {name: self._arguments[name] for name in names})
+            self.ended = self._phone.client.call(self._kind.end, self._end_arguments)
         except BexWifiError as failure:
             problem = failure
         if problem is None and self._kind.proof and self._phone.lock.started == self._method:

@@ -123,6 +123,15 @@ def test_a_client_of_another_version(prints, printed, words):
     raises(bexwifi.WrongClient, words, prints(printed).transmit, *TRANSMISSION)
 
 
+@pytest.mark.parametrize("end", [None, "RunTxStop"])
+def test_a_start_whose_end_is_not_known_is_not_called(prints, end):
+    methods = [{"name": name, "summary": "", "result": {"type": "int32", "meaning": ""}, "arguments": [
+        {"name": each, "type": "string", "meaning": "", "unit": None, "accepted": ""} for each in arguments]}
+        for name, arguments in {"RunTxBGStart": ["channel"], end: ["chain"]}.items()]
+    printing = prints(json.dumps({"schema_version": 1, "methods": methods}))
+    raises(bexwifi.WrongClient, "RunTxBGStart cannot be ended by RunTxStop", printing.transmit, "RunTxBGStart", 6)
+
+
 def test_a_client_that_is_too_old(prints):
     phone = prints("", "bex-wifi-client: unknown method \"stop\"; see bex-wifi-client --help\n", 2)
     for function in phone.stop, phone.doctor, lambda: phone.methods:
