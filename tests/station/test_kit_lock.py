@@ -6,21 +6,26 @@ import pathlib
 import re
 import subprocess
 import sys
+import tempfile
 import threading
 
 import pytest
 
 import bexwifi
 from bexwifi import lock
-from support.adb import TIMEOUT, Running
+from support.adb import TIMEOUT, Adb, Running
 from support.kit import raises
 from support.phone import ROOT
 from support.waiting import wait_for
 
+README = (ROOT / "client/README.md").read_text(encoding="utf-8")
+RADIO_SCRIPT = re.search(r"^cat >transmit.sh <<'END'\n(.*?)^END$", (ROOT / "docs/station.md").read_text(
+    encoding="utf-8"), re.M | re.S)[1]
+
 
 def path_of(serial):
     """The file that client/README.md tells shell scripts to lock."""
-    name = re.search(r"flock (/tmp/\S+\.lock) adb", (ROOT / "client/README.md").read_text())[1]
+    name = re.search(r"flock -o (/tmp/\S+\.lock) adb", README)[1]
     return pathlib.Path(name.replace("$SERIAL", serial))
 
 
@@ -49,6 +54,21 @@ def test_the_lock_of_a_shell_script_keeps_the_kit_away(phone, caplog):
         script.communicate(b"\n")
         call.join(TIMEOUT)
     assert answers == [True]
+
+
+@pytest.mark.parametrize("script", [
+    "SERIAL=$1; " + re.search(r"^flock .*$", README, re.M)[0], RADIO_SCRIPT], ids=["flock", "transmit.sh"])
+def test_a_server_that_adb_starts_does_not_keep_the_lock(script):
+    with tempfile.TemporaryDirectory(prefix="bex-adb-") as home:
+        adb, serial = Adb(home), pathlib.Path(home).name
+        try:
+            assert subprocess.run(["bash", "-c", script, "bash", serial, "0"], env=adb.environment, check=False,
+                                  timeout=TIMEOUT, capture_output=True).returncode == 1
+            assert pathlib.Path(home, "socket").exists()
+            assert is_free(serial)
+        finally:
+            adb("kill-server")
+            path_of(serial).unlink(missing_ok=True)
 
 
 def test_other_calls_may_be_kept_away_for_longer(phone):
