@@ -158,6 +158,7 @@ def test_a_key_after_the_command_has_ended_changes_nothing(any_new_phone):
         holder, = children(launcher.pid)
         sandbox, = children(holder)
         os.kill(holder, signal.SIGSTOP)
+        wait_for(lambda: stat(holder)[0] == "T")  # a signal that comes earlier is not left pending
         os.write(terminal, b"over\n")
         wait_for(lambda: stat(sandbox)[0] == "Z")
         os.write(terminal, b"\x03")
