@@ -8,6 +8,7 @@ import logging
 import os
 import sys
 import threading
+import time
 
 from bexwifi import signals
 from bexwifi.errors import NoLock
@@ -15,11 +16,18 @@ from bexwifi.errors import NoLock
 LOG = logging.getLogger("bexwifi")
 # The same file as in the README of bex-wifi-client, so that shell scripts with `flock` take turns too.
 PATH = "/tmp/bex-{}.lock"
+# The seconds between two looks at a lock that another program has.
+PAUSE = 0.1
 
 
 @signals.interruptible
 def _wait_for(descriptor):
-    fcntl.flock(descriptor, fcntl.LOCK_EX)
+    """Looks again and again: a signal that comes just before a wait in the kernel would not end it."""
+    while True:
+        signals.checkpoint()
+        with contextlib.suppress(BlockingIOError):
+            return fcntl.flock(descriptor, fcntl.LOCK_EX | fcntl.LOCK_NB)
+        time.sleep(PAUSE)
 
 
 class PhoneLock:

@@ -50,7 +50,6 @@ def test_an_unauthorised_phone(adb, device):
     serial = device(message(b"AUTH", 1, 0, bytes(20)))
     adb("connect", serial)
     raises(bexwifi.Unauthorised, "unauthorised: allow", lambda: bexwifi.Phone(serial).methods)
-    adb("disconnect", serial)
 
 
 def test_an_offline_phone(adb, device, monkeypatch):
@@ -58,7 +57,6 @@ def test_an_offline_phone(adb, device, monkeypatch):
     serial = device(b"")
     adb("connect", serial)
     raises(bexwifi.Offline, "offline: adb sees", lambda: bexwifi.Phone(serial).methods)
-    adb("disconnect", serial)
 
 
 def test_no_adb(monkeypatch):
