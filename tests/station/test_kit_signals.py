@@ -262,6 +262,22 @@ def test_a_signal_while_another_program_uses_the_phone(simulated, request):
     assert simulated.commands(since) == []
 
 
+def test_a_signal_just_before_the_wait_for_another_program(simulated):
+    program = """
+import logging, os, signal, sys
+import bexwifi
+class Kill(logging.Handler):
+    def emit(self, _):
+        os.kill(os.getpid(), signal.SIGTERM)
+logging.getLogger("bexwifi").addHandler(Kill())
+bexwifi.Phone(sys.argv[1]).call("RunTxStop", 6)
+"""
+    with bexwifi.Phone(simulated.serial).lock:
+        done = subprocess.run([sys.executable, "-c", program, simulated.serial], check=False, timeout=TIMEOUT,
+                              env={**os.environ, "PYTHONPATH": str(ROOT / "station")})
+    assert done.returncode == -signal.SIGTERM
+
+
 def test_what_a_killed_program_left_on_is_ended_before_the_next_start(program, simulated):
     assert program.stdout.readline() == "on\n"
     program.kill()
