@@ -10,6 +10,7 @@ import pytest
 
 from faults import stage
 from support.phone import CHIPS
+from support.radio import radio_use
 from support.waiting import wait_for
 
 # One of those with a proof of its own, and two whose tools differ.
@@ -35,19 +36,6 @@ def phone_fixture(request, make_phone):
     return phone
 
 
-def runs(phone):
-    """What the radio does: idle, or the name of a test."""
-    kept = phone.root / "phone/state/radio"  # there from the first tool's run on
-    if not kept.exists():
-        return "idle"
-    state = dict(line.replace("'", "").split("=", 1) for line in kept.read_text().splitlines())
-    if state.get("tone", "0") != "0":
-        return "tone"
-    if state["engine"] == "idle" and phone.call("getWlanMode")[1] == b"4\n":
-        return "monitor"
-    return state["engine"]
-
-
 def stop(phone, *options):
     code, out, err = phone.call("stop", *options)
     return code, out.decode(), err.decode()
@@ -57,13 +45,13 @@ def test_ends_whatever_runs(phone):
     for call, test in [([], "idle"), *STARTS]:
         if call:
             phone.call(*call)
-        assert runs(phone) == test
+        assert radio_use(phone) == test
         code, out, err = stop(phone, "11")
         assert (code, err) == (0, ""), (call, out)
         assert out.endswith(OFF)
         assert [line.split(":")[0] for line in out.splitlines()[:-1]] == [
             "RunTxStop", "RunTxStStop", "RunRxStop", "snifferStop"]
-        assert runs(phone) == "idle", call
+        assert radio_use(phone) == "idle", call
         assert phone.call("getWlanMode")[1] == b"0\n"
 
 
@@ -86,7 +74,7 @@ def test_after_a_start_that_is_still_running(phone):
         out, err = stopping.communicate(timeout=60)
     assert (stopping.returncode, err) == (0, b"")
     assert json.loads(out)["ok"]
-    assert runs(phone) == "idle"
+    assert radio_use(phone) == "idle"
     assert phone.explain(*TRANSMIT)[-1] in [line for line, _ in phone.commands(seen)]
 
 
@@ -116,7 +104,7 @@ def test_after_a_signal(make_phone, number):
     stage(phone, "sleep", "release")
     stage(phone, "sleep", "clear")
     assert stop(phone)[0] == 0
-    assert runs(phone) == "idle"
+    assert radio_use(phone) == "idle"
 
 
 @pytest.mark.parametrize("phone", KINDS, indirect=True)
@@ -124,9 +112,9 @@ def test_after_the_service_died(phone):
     """The radio goes on without it."""
     assert phone.call(*TRANSMIT)[0] == 0
     phone.phone("restart-service", phone.folder)
-    assert runs(phone) == "tx"
+    assert radio_use(phone) == "tx"
     assert stop(phone)[0] == 0
-    assert runs(phone) == "idle"
+    assert radio_use(phone) == "idle"
 
 
 @pytest.mark.parametrize("phone", KINDS, indirect=True)
@@ -140,7 +128,7 @@ def test_after_a_start_that_failed(phone):
     assert err.endswith(HINT)
     stage(phone, tool, "clear")
     assert stop(phone, "6")[0] == 0
-    assert runs(phone) == "idle"
+    assert radio_use(phone) == "idle"
 
 
 @pytest.mark.parametrize("phone", KINDS, indirect=True)
@@ -155,4 +143,4 @@ def test_what_does_not_stop_is_told(phone):
     assert err.endswith("; the radio may be on, try again: bex-wifi-client stop 6\n")
     stage(phone, tool, "clear")
     assert stop(phone, "6")[0] == 0
-    assert runs(phone) == "idle"
+    assert radio_use(phone) == "idle"
