@@ -99,6 +99,12 @@ def pytest_sessionstart(session):
         config.pluginmanager.register(Workers(config.pluginmanager.getplugin("dsession")))
 
 
+@pytest.hookimpl(tryfirst=True)
+def pytest_collection(session):
+    if INTERRUPTS in session.config.stash:
+        session.config.stash[INTERRUPTS].admit()
+
+
 @pytest.hookimpl(hookwrapper=True)
 def pytest_sessionfinish(session):
     """What ends a run is done to its end."""

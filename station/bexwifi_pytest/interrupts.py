@@ -15,10 +15,13 @@ import pytest
 
 # Seconds that xdist's workers get to switch their radios off; the kit gives up earlier.
 PATIENCE = 600
+SIGNALS = (signal.SIGINT, signal.SIGTERM, signal.SIGHUP)
 
 
 class Interrupts:
-    """Handles the signals of this process until restore().
+    """Handles the signals of this process until restore(). They wait for admit(), and so they do in
+    xdist's workers, which the controller starts meanwhile: Python cannot start with a KeyboardInterrupt
+    in the middle, and before that pytest makes no report.
 
     ignored: whether they do nothing from here on
     """
@@ -26,7 +29,8 @@ class Interrupts:
     def __init__(self):
         self.ignored = False
         self.before = {}
-        for number in (signal.SIGINT, signal.SIGTERM, signal.SIGHUP):
+        signal.pthread_sigmask(signal.SIG_BLOCK, SIGNALS)
+        for number in SIGNALS:
             if signal.getsignal(number) != signal.SIG_IGN:  # as under nohup
                 self.before[number] = signal.signal(number, self._interrupt)
 
@@ -35,7 +39,12 @@ class Interrupts:
             self.ignored = True
             raise KeyboardInterrupt
 
+    @staticmethod
+    def admit():
+        signal.pthread_sigmask(signal.SIG_UNBLOCK, SIGNALS)
+
     def restore(self):
+        self.admit()
         for number, handler in self.before.items():
             signal.signal(number, handler)
 

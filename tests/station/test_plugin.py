@@ -12,7 +12,9 @@ from unittest import mock
 import lxml.html
 import pytest
 
+import servicelog
 from bexwifi_pytest.interrupts import Workers
+from bexwifi_pytest.servicelog import RUNNERS
 from support.adb import Running
 from support.phone import ROOT
 
@@ -295,6 +297,21 @@ def test_last(phone):
     assert 'name="test_last[R2]"' not in text_of(station, "junit.xml")
 
 
+def test_an_interrupt_while_the_workers_start(station, pytester, monkeypatch):
+    """Ctrl-C reaches them, too, before Python has come to the plugin."""
+    pytester.makepyfile(sitecustomize="""
+import os, signal, sys
+if "-c" in sys.orig_argv:
+    os.kill(os.getppid(), signal.SIGINT)
+    os.kill(os.getpid(), signal.SIGINT)
+""")
+    monkeypatch.setenv("PYTHONPATH", f"{pytester.path}:{os.environ['PYTHONPATH']}")
+    done = station("def test_a(phone):\n    pass", "-n2")
+    assert done.ret == pytest.ExitCode.INTERRUPTED
+    assert "Traceback" not in "\n".join(done.outlines + done.errlines)
+    assert "The run was interrupted" in text_of(station, "report.html")
+
+
 def test_a_signal_does_not_disturb_the_report(station, pytester):
     pytester.makeconftest("""
 import os, signal
@@ -331,6 +348,10 @@ def test_dies(phone):
         ("R1", "plan.py::test_dies", "passed"), ("R1", "plan.py::test_first", "passed"),
         ("R2", "plan.py::test_dies", "failed"), ("R2", "plan.py::test_first", "passed")]
     assert rows(station, "phone", "value") == [("R1", "5"), ("R2", "5")]
+
+
+def test_both_readers_of_the_log_know_the_service_s_runners():
+    assert set(RUNNERS) == servicelog.RUNNERS
 
 
 def test_a_plan_that_cannot_be_read_is_no_pass(station):
