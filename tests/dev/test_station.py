@@ -32,7 +32,7 @@ def station_fixture(tmp_path):
 
     def start(*arguments):
         return subprocess.Popen(
-            [ROOT / "dev", "station", *arguments, f"--wifi-report={tmp_path}/report"], text=True, cwd=tmp_path,
+            [ROOT / "dev", "station", *arguments, "--wifi-report=report"], text=True, cwd=tmp_path,
             stdin=subprocess.DEVNULL, stdout=subprocess.PIPE, stderr=subprocess.PIPE, start_new_session=True,
             env={**os.environ, "BEX_PHONES": str(tmp_path / "phones")})
 

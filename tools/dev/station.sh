@@ -4,8 +4,8 @@
 #
 # A plan on all the simulated phones at once, by the real adb. For ./dev.
 
-readonly STATION_REPORT=build/station
-readonly EXAMPLE_PLAN=station/example/plan.py
+readonly STATION_REPORT=$PWD/build/station
+readonly EXAMPLE_PLAN=$PWD/station/example/plan.py
 # Seconds that an interrupted plan has to switch its radios off and to write its report.
 readonly STATION_PATIENCE=120
 # Where adb's server of this run has its socket and its keys, and the locks of its phones.
@@ -31,15 +31,14 @@ start_adb() {
         die "adb's server does not start: $(tail -n 1 "$station_home/complaints")"
 }
 
-# Debian's Python has the packages.
+# Debian's Python has the packages. It runs where the user is, so that relative paths are theirs.
 #
 # run_station [PLAN] [PYTEST-OPTION]...
 run_station() {
     local plan=$EXAMPLE_PLAN chip serial options=() failed=0
     if [[ ${1-} == *.py ]]; then
-        # Relative to where the user is.
-        plan=$(cd "$OLDPWD" && realpath -s -- "$1")
-        [ -f "$plan" ] || die "there is no plan $1" 2
+        plan=$1
+        (cd "$OLDPWD" && [ -f "$plan" ]) || die "there is no plan $1" 2
         shift
     fi
     need station
@@ -53,8 +52,8 @@ run_station() {
         station_locks+=("/tmp/bex-$serial.lock")
     done
     start_adb
-    PYTHONPATH=station${PYTHONPATH:+:$PYTHONPATH} \
-        tools/dev/supervise.py --clean-up "$STATION_PATIENCE" \
+    PYTHONPATH=$PWD/station${PYTHONPATH:+:$PYTHONPATH} \
+        env -C "$OLDPWD" "$PWD/tools/dev/supervise.py" --clean-up "$STATION_PATIENCE" \
         /usr/bin/python3 -B -u -m pytest -p bexwifi_pytest -p no:cacheprovider "$plan" "${options[@]}" \
         -n "${#station_locks[@]}" --wifi-report "$STATION_REPORT" "$@" || failed=$?
     return "$failed"
