@@ -20,7 +20,8 @@ class BexWifiError(Exception):
     def __init__(self, serial, words, answer=None):
         super().__init__(serial, words, answer)
         self.serial = serial
-        self.words = " ".join(str(words).splitlines())
+        # A phone's own output reaches the station's terminal and log.
+        self.words = "".join(each if each.isprintable() else " " for each in str(words)).strip()
         self.answer = answer
 
     def __str__(self):

@@ -119,8 +119,8 @@ def start(phone, method, arguments):
     except BaseException as error:
         if isinstance(error, BexWifiError) and not error.radio_may_be_on:
             lock.started = ""
-        else:
-            switch_off_after(phone, error)
+        elif switch_off_after(phone, error) and isinstance(error, BexWifiError):
+            error.words += "; it was switched off"
         raise
 
 

@@ -30,8 +30,10 @@ def device_fixture(adb):
                 with contextlib.suppress(OSError):
                     while True:
                         connection = ends.enter_context(server.accept()[0])
+                        connection.recv(1 << 16)
+                        connection.sendall(greeting)
                         while connection.recv(1 << 16):
-                            connection.sendall(greeting)
+                            pass
 
             ends.callback(server.shutdown, socket.SHUT_RDWR)
             threading.Thread(target=serve, daemon=True).start()
@@ -47,7 +49,8 @@ def test_an_unknown_serial_number(serial):
 
 
 def test_an_unauthorised_phone(adb, device):
-    serial = device(message(b"AUTH", 1, 0, bytes(20)))
+    # It takes no signature; to the key itself a phone answers when its user does.
+    serial = device(2 * message(b"AUTH", 1, 0, bytes(20)))
     adb("connect", serial)
     raises(bexwifi.Unauthorised, "unauthorised: allow", lambda: bexwifi.Phone(serial).methods)
 
@@ -182,10 +185,11 @@ def test_the_radio_is_off_whatever_its_end_answers(phone, simulated, monkeypatch
 
 @pytest.mark.parametrize("code, err, words", [
     (0, "", "adb ended with 0 and printed nothing"), (137, "", "adb ended with 137"),
-    (1, "error: closed\n", "error: closed"), (0, "bex-wifi-client: warning: channel 999\n", "channel 999")])
+    (1, "error: closed\n", "error: closed"), (1, "sh: \x1b[2J\x9b\n", "sh:  [2J"), (0, "bex-wifi-client: warning: channel 999\n", "channel 999")])
 def test_no_answer_is_not_success(prints, code, err, words):
     failed = raises(bexwifi.NoAnswer, words, prints("", err, code).client.call, "RunTxStop", {})
     assert failed.may_go_on
+    assert str(failed).isprintable()
 
 
 def test_an_adb_that_hangs_is_ended(tmp_path, monkeypatch):
@@ -223,3 +227,10 @@ def test_a_failed_command(phone, simulated):
     failed = raises(bexwifi.CommandFailed, "RunTxStop", phone.call, "RunTxStop", 6)
     assert (failed.answer.value, failed.answer.exit_code) == (-1, 1)
     assert failed.words == failed.answer.error
+
+
+def test_a_failed_start_is_switched_off(phone, simulated):
+    simulated.fault("wl", "--when", "*pkteng_start*", "exit", "1")
+    failed = raises(bexwifi.CommandFailed, "; it was switched off", phone.call, *TRANSMISSION)
+    assert failed.words == f"{failed.answer.error}; it was switched off"
+    assert radio_use(simulated) == "idle"
