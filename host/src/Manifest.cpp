@@ -7,11 +7,11 @@
 
 #include <glob.h>
 #include <log/log.h>
+#include <regex.h>
 #include <tinyxml2.h>
 
 #include <cstdlib>
 #include <optional>
-#include <regex>
 #include <set>
 #include <vector>
 
@@ -33,12 +33,31 @@ struct Wanted {
     std::string interface;
 };
 
+/**
+ * The parts in parentheses of a text that fits an extended regular expression, see regex(7); empty
+ * when it does not. The compiler needs seconds for std::regex.
+ */
+std::vector<std::string> partsOf(const std::string& text, const char* pattern) {
+    std::vector<std::string> parts;
+    regex_t expression;
+    if (regcomp(&expression, pattern, REG_EXTENDED) != 0) return parts;
+    std::vector<regmatch_t> matches(expression.re_nsub + 1);
+    matches[0] = {0, static_cast<regoff_t>(text.size())}; // a NUL does not end it
+    if (regexec(&expression, text.data(), matches.size(), matches.data(), REG_STARTEND) == 0) {
+        for (size_t i = 1; i < matches.size(); ++i) {
+            const auto [begin, end] = matches[i];
+            parts.push_back(begin < 0 ? "" : text.substr(begin, end - begin));
+        }
+    }
+    regfree(&expression);
+    return parts;
+}
+
 bool covers(const std::string& version, const Wanted& wanted) {
-    static const std::regex kVersion(R"((\d{1,5})\.(\d{1,5})(?:-(\d{1,5}))?)");
-    std::smatch part;
-    if (!std::regex_match(version, part, kVersion)) return false;
-    const std::string newest = part[3].matched ? part[3].str() : part[2].str();
-    return std::stoi(part[1]) == wanted.major && std::stoi(newest) >= wanted.minor;
+    const auto part = partsOf(version, "^([0-9]{1,5})\\.([0-9]{1,5})(-([0-9]{1,5}))?$");
+    if (part.empty()) return false;
+    const std::string& newest = part[3].empty() ? part[1] : part[3];
+    return std::stoi(part[0]) == wanted.major && std::stoi(newest) >= wanted.minor;
 }
 
 std::string textOf(const XMLElement* element) {
@@ -98,10 +117,9 @@ void addFile(const std::string& path, const Wanted& wanted, Instances* found) {
 } // namespace
 
 std::set<std::string> instancesInManifest(const std::string& descriptor) {
-    static const std::regex kDescriptor(R"(([^@]+)@(\d{1,5})\.(\d{1,5})::(\w+))");
-    std::smatch part;
-    if (!std::regex_match(descriptor, part, kDescriptor)) return {};
-    const Wanted wanted = {part[1], std::stoi(part[2]), std::stoi(part[3]), part[4]};
+    const auto part = partsOf(descriptor, "^([^@]+)@([0-9]{1,5})\\.([0-9]{1,5})::([[:alnum:]_]+)$");
+    if (part.empty()) return {};
+    const Wanted wanted = {part[0], std::stoi(part[1]), std::stoi(part[2]), part[3]};
 
     Instances found;
     const std::string folder = hostRoot() + "/vendor/etc/vintf/";

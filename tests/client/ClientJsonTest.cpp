@@ -1,9 +1,8 @@
 // Copyright 2026 The BEX Wi-Fi Authors
 // SPDX-License-Identifier: Apache-2.0
 
-#include <regex>
-
 #include "ClientTest.h"
+#include "Matches.h"
 
 namespace vendor::korvan::bex::wifi::client {
 namespace {
@@ -13,13 +12,15 @@ using ::testing::HasSubstr;
 using ::testing::StartsWith;
 
 // What tells of the call's course differs from run to run.
-std::string withoutCourse(const std::string& json) {
-    return std::regex_replace(json,
-                              std::regex(R"("radio_may_be_on":(true|false|null),"stage":"[a-z]+",)"
-                                         R"("started_at":"[0-9-]+T[0-9:]+\.[0-9]{3}Z",)"
-                                         R"("duration_ms":[0-9]+\.[0-9]{3},)"
-                                         R"("client_version":"[0-9.]+",)"),
-                              "COURSE,");
+std::string withoutCourse(std::string json) {
+    for (const std::string& course :
+         matches(json, R"("radio_may_be_on":(true|false|null),"stage":"[a-z]+",)"
+                       R"("started_at":"[0-9-]+T[0-9:]+\.[0-9]{3}Z",)"
+                       R"("duration_ms":[0-9]+\.[0-9]{3},)"
+                       R"("client_version":"[0-9.]+",)")) {
+        json.replace(json.find(course), course.size(), "COURSE,");
+    }
+    return json;
 }
 
 TEST_F(ClientDeadlineTest, JsonAfterTheDeadline) {
@@ -130,10 +131,7 @@ TEST_F(ClientTest, JsonTellsHowFarTheCallCameAndWhatMayBeOn) {
     const auto members = [this](const Words& call) {
         mOut.str("");
         run(call);
-        std::smatch found;
-        const std::string json = out();
-        std::regex_search(json, found, std::regex("\"radio_may_be_on\":.*?,\"started_at"));
-        return found.str();
+        return matches(out(), "\"radio_may_be_on\":.*,\"started_at").at(0);
     };
     EXPECT_THAT(members({"--json", "RunTxStStart", "6", "20", "1"}),
                 StartsWith(R"("radio_may_be_on":true,"stage":"done",)"));

@@ -8,10 +8,10 @@
 #include <gtest/gtest.h>
 
 #include <ostream>
-#include <regex>
 #include <set>
 #include <sstream>
 
+#include "Matches.h"
 #include "chips/ChipFamily.h"
 #include "client/Commands.h"
 #include "client/doctor/PhoneChecks.h"
@@ -73,14 +73,11 @@ class FamilyNeedsTest : public ::testing::TestWithParam<ChipFamily> {
         return tools;
     }
 
-    Words matches(const std::string& pattern) const {
+    Words inLines(const std::string& pattern) const {
         Words found;
         for (const std::string& line : mShell.lines()) {
-            const std::regex expression(pattern);
-            for (std::sregex_iterator it(line.begin(), line.end(), expression), end; it != end;
-                 ++it) {
-                found.insert(it->str());
-            }
+            const auto parts = matches(line, pattern);
+            found.insert(parts.begin(), parts.end());
         }
         return found;
     }
@@ -103,11 +100,11 @@ TEST_P(FamilyNeedsTest, TheDriversFiles) {
         const std::string module = std::string("/sys/module/") + file.module + "/";
         EXPECT_EQ(*file.module != '\0', std::string(file.path).rfind(module, 0) == 0) << file.path;
     }
-    EXPECT_EQ(named, matches("/(sys|etc)/[^ \"]*"));
+    EXPECT_EQ(named, inLines("/(sys|etc)/[^ \"]*"));
 }
 
 TEST_P(FamilyNeedsTest, TheModules) {
-    const Words loaded = matches("/[^ ]*\\.ko");
+    const Words loaded = inLines("/[^ ]*\\.ko");
     switch (mFamily.modules) {
         case DriverModules::none:
             EXPECT_EQ(loaded, Words{});

@@ -6,9 +6,9 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <regex>
 
 #include "FakeService.h"
+#include "Matches.h"
 #include "client/Help.h"
 #include "client/base/Json.h"
 
@@ -20,7 +20,11 @@ using ::testing::StartsWith;
 
 // As it was before it was wrapped.
 std::string inOneLine(const std::string& text) {
-    return std::regex_replace(text, std::regex("\\s+"), " ");
+    std::string line;
+    for (const std::string& word : matches(text, "[^[:space:]]+")) {
+        line += (line.empty() ? "" : " ") + word;
+    }
+    return line;
 }
 
 TEST(HelpTest, FitsIntoEightyColumns) {
