@@ -1,12 +1,41 @@
-# room(<name> SOURCES <files>... DEPENDS <targets>...): a folder of this project as a static library.
-# What it links is what it may include; includes are written from the project's root.
-
 set(ROOM_WARNINGS -Wall -Wextra -Werror)
 
+# read_once(<name> <target> <header>...): the compiler reads these headers once for all that name the same
+# <name>. The preset "clang" goes without, and so shows an #include that is missing.
+function(read_once name target)
+    if(NOT TARGET ${name})
+        file(GENERATE OUTPUT ${PROJECT_BINARY_DIR}/${name}.cpp CONTENT "")
+        add_library(${name} OBJECT ${PROJECT_BINARY_DIR}/${name}.cpp)
+        get_target_property(options ${target} COMPILE_OPTIONS)
+        target_compile_options(${name} PRIVATE ${options})
+        target_precompile_headers(${name} PRIVATE ${ARGN})
+    endif()
+    target_precompile_headers(${target} REUSE_FROM ${name})
+endfunction()
+
+set(ROOM_HEADERS
+    <algorithm>
+    <chrono>
+    <functional>
+    <map>
+    <memory>
+    <mutex>
+    <optional>
+    <set>
+    <sstream>
+    <string>
+    <thread>
+    <utility>
+    <vector>
+)
+
+# room(<name> SOURCES <files>... DEPENDS <targets>...): a folder of this project as a static library.
+# What it links is what it may include; includes are written from the project's root.
 function(room name)
     cmake_parse_arguments(ROOM "" "" "SOURCES;DEPENDS" ${ARGN})
     add_library(${name} STATIC ${ROOM_SOURCES})
     target_compile_options(${name} PRIVATE ${ROOM_WARNINGS})
+    read_once(room-headers ${name} ${ROOM_HEADERS})
     target_include_directories(${name} PUBLIC ${PROJECT_SOURCE_DIR})
     target_link_libraries(${name} PUBLIC ${ROOM_DEPENDS})
 endfunction()
@@ -36,16 +65,8 @@ function(test_program name)
         target_compile_options(${name} PRIVATE -O0)
     endif()
     target_link_libraries(${name} PRIVATE GTest::gmock)
-    if(NOT TARGET test-headers)
-        # GoogleTest's headers, read once for all programs.
-        file(GENERATE OUTPUT ${PROJECT_BINARY_DIR}/test-headers.cpp CONTENT "")
-        add_library(test-headers OBJECT ${PROJECT_BINARY_DIR}/test-headers.cpp)
-        get_target_property(options ${name} COMPILE_OPTIONS)
-        target_compile_options(test-headers PRIVATE ${options})
-        target_link_libraries(test-headers PRIVATE GTest::gmock)
-        target_precompile_headers(test-headers PRIVATE <gmock/gmock.h>)
-    endif()
-    target_precompile_headers(${name} REUSE_FROM test-headers)
+    read_once(test-headers ${name} <gmock/gmock.h>)
+    target_link_libraries(test-headers PRIVATE GTest::gmock)
 endfunction()
 
 # unit_test(...): the same, run as one test. GTEST_FILTER in the environment chooses among its cases.
