@@ -15,6 +15,9 @@ from load import HERE, load_install
 
 TOOLS = ["cat", "ifconfig", "iwconfig", "iwlist", "iwpriv", "myftm", "ping", "rmmod", "setprop", "sleep"]
 
+# Debian's mksh without shared libraries: it is started tens of thousands of times, too.
+SHELL = "/usr/lib/klibc/bin/mksh"
+
 # Method: arguments. NUMBER is the call's own; CHANNEL, for methods that hand nothing else to a tool,
 # is one of the 2.4 GHz band for an odd number, else one of the 5 GHz band.
 ARGUMENTS = {
@@ -54,7 +57,7 @@ ANSWERS = collections.defaultdict(lambda: STATUS, {
 def make_stand_in_phone(make):
     """`make` makes a phone of a description and of files to install."""
     tool = os.environ["BEX_STAND_IN"]
-    return make(HERE / "phone", load_install(),
+    return make(HERE / "phone", load_install(), f"{SHELL}=/system/bin/sh",
                 *(f"{tool}=/vendor/bin/{name}" for name in TOOLS))
 
 
