@@ -116,6 +116,7 @@ def test_an_interrupt_at_any_moment_leaves_every_radio_off(moment, whole_run, tm
     over = command_lines(watched) - before == whole_run[watched]
     assert code == INTERRUPTED or (code == 0 and over), output(tmp_path)
     assert "MAY BE ON" not in output(tmp_path)
+    assert "Traceback" not in output(tmp_path)
     leaves_nothing(run, phones)
 
 
