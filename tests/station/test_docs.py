@@ -2,7 +2,9 @@
 # SPDX-License-Identifier: Apache-2.0
 """docs/station.md: what it tells a reader to type works, from the first block to the last."""
 
+import contextlib
 import os
+import pathlib
 import re
 import shutil
 import subprocess
@@ -12,8 +14,10 @@ import pytest
 
 import bexwifi
 from bexwifi import errors
+from support.adb import Running
 from support.phone import ROOT
 from support.radio import radio_use
+from support.waiting import wait_during
 
 PAGE = (ROOT / "docs/station.md").read_text(encoding="utf-8")
 BLOCKS = re.findall(r"^```(\w+)\n(.*?)^```$", PAGE, re.M | re.S)
@@ -83,6 +87,29 @@ def test_every_block_works(outputs, reader, phone_of):
     assert 'cmd: "wl pkteng_start' in (report / "logcat.txt").read_text(encoding="utf-8")
     for chip in PHONES.values():
         assert radio_use(phone_of(chip)) == "idle"
+
+
+def children_of(process):
+    """Their names, each with a newline."""
+    numbers = pathlib.Path(f"/proc/{process.pid}/task/{process.pid}/children").read_text(encoding="ascii")
+    names = []
+    for number in numbers.split():
+        with contextlib.suppress(OSError):  # it has ended
+            names.append(pathlib.Path(f"/proc/{number}/comm").read_text(encoding="ascii"))
+    return names
+
+
+def test_a_signal_ends_the_script_at_once(outputs, reader, phone_of):
+    assert outputs
+    simulated = phone_of("broadcom")
+    with Running(["bash", "transmit.sh", simulated.serial, "1000"], cwd=reader.folder) as script:
+        wait_during(script, lambda: "sleep\n" in children_of(script))
+        assert radio_use(simulated) == "tx"
+        script.terminate()
+        assert script.wait(60) == 130
+    assert radio_use(simulated) == "idle"
+    with pytest.raises(ProcessLookupError):
+        os.killpg(script.pid, 0)
 
 
 def test_it_installs_what_the_entry_script_installs(outputs, reader):
