@@ -14,9 +14,10 @@ set(CMAKE_FIND_ROOT_PATH_MODE_LIBRARY ONLY)
 set(CMAKE_FIND_ROOT_PATH_MODE_INCLUDE ONLY)
 set(CMAKE_FIND_ROOT_PATH_MODE_PACKAGE ONLY)
 
-# The linker looks here for the libraries that the libraries themselves need.
+# The linker looks here for the libraries that the libraries themselves need. Flags are not quoted, so the
+# checkout's path, which may have a blank, is not among them: Ninja builds in build/arm64.
 foreach(folder aarch64-linux-gnu aarch64-linux-gnu/android p7zip)
-    string(APPEND CMAKE_EXE_LINKER_FLAGS_INIT " -Wl,-rpath-link,${sysroot}/usr/lib/${folder}")
+    string(APPEND CMAKE_EXE_LINKER_FLAGS_INIT " -Wl,-rpath-link,../arm64-sysroot/usr/lib/${folder}")
 endforeach()
 
 set(CMAKE_CROSSCOMPILING_EMULATOR qemu-aarch64 -L ${sysroot})
