@@ -145,6 +145,17 @@ def test_other_paths_reach_the_build(tmp_path, name):
     assert len(scratch.calls()) == 2
 
 
+@pytest.mark.skipif(not shutil.which("aarch64-linux-gnu-g++"), reason="./dev test --arch arm64 installs it")
+@pytest.mark.parametrize("name", ["a folder", "it's", "$HOME"])
+def test_the_cross_compiler_links_in_other_paths(tmp_path, name):
+    checkout = tmp_path / name
+    shutil.copytree(ROOT / "cmake", checkout / "cmake")
+    (checkout / "CMakeLists.txt").write_text("cmake_minimum_required(VERSION 3.25)\nproject(tiny LANGUAGES CXX)\n")
+    done = subprocess.run(["cmake", "-G", "Ninja", "--toolchain", "cmake/Arm64.cmake", "-B", "build/arm64"],
+                          cwd=checkout, check=False, capture_output=True, text=True)
+    assert done.returncode == 0, done.stderr
+
+
 def test_neither_root_nor_sudo(scratch):
     scratch.program("dpkg-query", MISSING)
     scratch.program("id", "echo 1000")
