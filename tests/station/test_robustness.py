@@ -18,6 +18,7 @@ import xml.etree.ElementTree as ET
 
 import pytest
 
+from bexwifi.radio import kind_of
 from support.adb import processes_of
 from support.phone import ROOT
 from support.radio import radio_use
@@ -77,7 +78,8 @@ def leaves_nothing(run, phones):
         with open(f"/tmp/bex-{phone.serial}.lock", "a+", encoding="utf-8") as lock:
             fcntl.flock(lock, fcntl.LOCK_EX | fcntl.LOCK_NB)
             lock.seek(0)
-            assert lock.read() == ""
+            # At most the name of a call that starts nothing, whose end nobody has waited for.
+            assert kind_of(lock.read()) is None
 
 
 def command_lines(phone):
