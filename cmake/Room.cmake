@@ -108,13 +108,19 @@ function(process_test name)
     )
 endfunction()
 
-# process_tests(<folder> [ENVIRONMENT <NAME=value>...]): every test_*.py of a folder as a test of its
-# own, <folder>.<name>, so that they run beside each other; without the ones called test_faults_*.
+# process_tests(<folder> [ENVIRONMENT <NAME=value>...] [FIRST <name>...]): every test_*.py of a folder as
+# a test of its own, <folder>.<name>, so that they run beside each other; without the ones called
+# test_faults_*. FIRST are long ones, which would run on alone if they were the last.
 function(process_tests folder)
+    cmake_parse_arguments(TESTS "" "" "FIRST" ${ARGN})
     file(GLOB files CONFIGURE_DEPENDS RELATIVE ${CMAKE_CURRENT_SOURCE_DIR} ${folder}/test_*.py)
     list(FILTER files EXCLUDE REGEX "/test_faults_")
     foreach(file ${files})
         string(REGEX REPLACE ".*/test_(.*)\\.py" "\\1" name ${file})
-        process_test(${folder}.${name} ${file} COST 30 ${ARGN})
+        set(cost 30)
+        if(name IN_LIST TESTS_FIRST)
+            set(cost 80)
+        endif()
+        process_test(${folder}.${name} ${file} COST ${cost} ${TESTS_UNPARSED_ARGUMENTS})
     endforeach()
 endfunction()
