@@ -40,7 +40,9 @@ def plan(phones, folder, *arguments):
             [sys.executable, "-B", "-u", "-m", "pytest", "-p", "bexwifi_pytest", "-p", "no:cacheprovider", PLAN,
              f"--wifi-report={folder}", *(f"--wifi-phone={phone.serial}" for phone in phones), *arguments],
             env={**os.environ, "PYTHONPATH": str(ROOT / "station"), "PYTEST_ADDOPTS": ""},
-            stdin=subprocess.DEVNULL, stdout=out, stderr=out, start_new_session=True)
+            stdin=subprocess.DEVNULL, stdout=out, stderr=out, start_new_session=True,
+            # Whoever started this test in the background had it ignore SIGINT.
+            preexec_fn=lambda: signal.signal(signal.SIGINT, signal.SIG_DFL))
     try:
         yield run
     finally:
@@ -114,8 +116,8 @@ def test_an_interrupt_at_any_moment_leaves_every_radio_off(moment, whole_run, tm
         with contextlib.suppress(ProcessLookupError):
             (os.killpg if moment % 2 else os.kill)(run.pid, signal.SIGINT)
         code = run.wait(TIMEOUT)
-    # On a busy machine the plan may be over before this test sees that the moment has come.
-    over = command_lines(watched) - before == whole_run[watched]
+    # On a busy machine the plan may be over before this test sees that a later moment has come.
+    over = moment > 0 and command_lines(watched) - before == whole_run[watched]
     assert code == INTERRUPTED or (code == 0 and over), output(tmp_path)
     assert "MAY BE ON" not in output(tmp_path)
     assert "Traceback" not in output(tmp_path)
