@@ -9,6 +9,7 @@ import signal
 import pytest
 
 from conftest import ENDLESS, SERVICE, Launcher, Phone
+from support.processes import children
 from support.waiting import wait_for
 
 ASK = "/data/ask"
@@ -112,7 +113,7 @@ def test_killing_a_run_takes_everything_inside_with_it(any_new_phone, victim, nu
     wait_for(lambda: len(any_new_phone.sleepers()) == 3)
     pid = call.pid
     for _ in range(("launcher", "holder", "sandbox").index(victim)):
-        pid = int(pathlib.Path(f"/proc/{pid}/task/{pid}/children").read_text().split()[0])
+        pid = children(pid)[0]
     os.kill(pid, number)
     call.wait(60)
     wait_for(lambda: any_new_phone.processes() == [])

@@ -17,6 +17,7 @@ import termios
 import pytest
 
 from conftest import ENDLESS
+from support.processes import children
 from support.waiting import wait_for
 
 WORDS = "the caller lives"
@@ -146,10 +147,6 @@ def pending(pid, number):
     """Whether a signal waits for a process."""
     status = pathlib.Path(f"/proc/{pid}/status").read_text()
     return int(re.search(r"^ShdPnd:\s*(\w+)", status, re.M)[1], 16) >> number - 1 & 1
-
-
-def children(pid):
-    return [int(child) for child in pathlib.Path(f"/proc/{pid}/task/{pid}/children").read_text().split()]
 
 
 def test_a_key_after_the_command_has_ended_changes_nothing(any_new_phone):

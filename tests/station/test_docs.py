@@ -16,6 +16,7 @@ import bexwifi
 from bexwifi import errors
 from support.adb import Running
 from support.phone import ROOT
+from support.processes import children
 from support.radio import radio_use
 from support.waiting import wait_during
 
@@ -89,21 +90,20 @@ def test_every_block_works(outputs, reader, phone_of):
         assert radio_use(phone_of(chip)) == "idle"
 
 
-def children_of(process):
-    """Their names, each with a newline."""
-    numbers = pathlib.Path(f"/proc/{process.pid}/task/{process.pid}/children").read_text(encoding="ascii")
-    names = []
-    for number in numbers.split():
-        with contextlib.suppress(OSError):  # it has ended
-            names.append(pathlib.Path(f"/proc/{number}/comm").read_text(encoding="ascii"))
-    return names
+def sleeps(script):
+    """Whether it has come to its sleep; its other children end at any moment."""
+    for child in children(script.pid):
+        with contextlib.suppress(OSError):
+            if pathlib.Path(f"/proc/{child}/comm").read_text(encoding="ascii") == "sleep\n":
+                return True
+    return False
 
 
 def test_a_signal_ends_the_script_at_once(outputs, reader, phone_of):
     assert outputs
     simulated = phone_of("broadcom")
     with Running(["bash", "transmit.sh", simulated.serial, "1000"], cwd=reader.folder) as script:
-        wait_during(script, lambda: "sleep\n" in children_of(script))
+        wait_during(script, lambda: sleeps(script))
         assert radio_use(simulated) == "tx"
         script.terminate()
         assert script.wait(60) == 130
