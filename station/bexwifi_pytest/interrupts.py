@@ -13,9 +13,10 @@ import time
 
 import pytest
 
+from bexwifi import signals
+
 # Seconds that xdist's workers get to switch their radios off; the kit gives up earlier.
 PATIENCE = 600
-SIGNALS = (signal.SIGINT, signal.SIGTERM, signal.SIGHUP)
 
 
 class Interrupts:
@@ -29,8 +30,8 @@ class Interrupts:
     def __init__(self):
         self.ignored = False
         self.before = {}
-        signal.pthread_sigmask(signal.SIG_BLOCK, SIGNALS)
-        for number in SIGNALS:
+        signal.pthread_sigmask(signal.SIG_BLOCK, signals.NUMBERS)
+        for number in signals.NUMBERS:
             if signal.getsignal(number) != signal.SIG_IGN:  # as under nohup
                 self.before[number] = signal.signal(number, self._interrupt)
 
@@ -41,7 +42,7 @@ class Interrupts:
 
     @staticmethod
     def admit():
-        signal.pthread_sigmask(signal.SIG_UNBLOCK, SIGNALS)
+        signal.pthread_sigmask(signal.SIG_UNBLOCK, signals.NUMBERS)
 
     def restore(self):
         self.admit()
