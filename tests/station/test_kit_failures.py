@@ -185,7 +185,8 @@ def test_the_radio_is_off_whatever_its_end_answers(phone, simulated, monkeypatch
 
 @pytest.mark.parametrize("code, err, words", [
     (0, "", "adb ended with 0 and printed nothing"), (137, "", "adb ended with 137"),
-    (1, "error: closed\n", "error: closed"), (1, "sh: \x1b[2J\x9b\n", "sh:  [2J"), (0, "bex-wifi-client: warning: channel 999\n", "channel 999")])
+    (1, "error: closed\n", "error: closed"), (1, "sh: \x1b[2J\x9b\n", "sh:  [2J"),
+    (0, "bex-wifi-client: warning: channel 999\n", "channel 999")])
 def test_no_answer_is_not_success(prints, code, err, words):
     failed = raises(bexwifi.NoAnswer, words, prints("", err, code).client.call, "RunTxStop", {})
     assert failed.may_go_on
