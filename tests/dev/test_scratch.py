@@ -164,7 +164,8 @@ def test_neither_root_nor_sudo(scratch):
     assert (code, out) == (1, "")
     line, = err.splitlines()
     assert line.startswith("dev: packages are missing, and sudo wants a password that it cannot ask for")
-    assert line.endswith("; as root: apt-get install blueprint-tools clang-format git")
+    assert line.endswith(
+        "; as root: apt-get install --no-install-recommends blueprint-tools clang-format git")
 
 
 def test_ctrl_c_lets_the_package_manager_finish_and_goes_no_further(scratch):

@@ -48,10 +48,12 @@ missing_of() {
 # need COMMAND: installs what is missing for it, in one go.
 need() {
     local packages missing root=() by_hand
+    # Debian recommends 200 more with them, which no command needs.
+    local -ra install=(apt-get install --no-install-recommends)
     read -ra packages < <(packages_of "$1")
     mapfile -t missing < <(missing_of "${packages[@]}")
     [ ${#missing[@]} -gt 0 ] || return 0
-    by_hand="as root: apt-get install ${missing[*]}"
+    by_hand="as root: ${install[*]} ${missing[*]}"
     if [ "$(id -u)" -ne 0 ]; then
         command -v sudo >/dev/null || die "packages are missing, and this is neither root nor sudo; $by_hand"
         root=(sudo)
@@ -65,7 +67,7 @@ need() {
     take_turn build/install.lock "another ./dev installs packages"
     if ! undisturbed logged build/install.log "${root[@]}" apt-get update ||
         ! undisturbed logged build/install.log "${root[@]}" env DEBIAN_FRONTEND=noninteractive \
-            apt-get -o DPkg::Lock::Timeout=600 install -y "${missing[@]}"; then
+            "${install[@]}" -o DPkg::Lock::Timeout=600 -y "${missing[@]}"; then
         tail -n 20 build/install.log >&2
         die "installing failed: see build/install.log; $by_hand"
     fi
