@@ -32,14 +32,14 @@ def messages(log):
 
 def commands(log):
     """The commands of a piece of log."""
-    printed = ""
+    printed = []  # joined once: there may be megabytes
     for tag, text in messages(log):
         if tag not in RUNNERS:
             continue
         text = text.rstrip("\n")
         command = COMMAND.fullmatch(text)
         if command is None:
-            printed += text + "\n"
+            printed.append(text + "\n")
             continue
-        yield Command(command[1], command[2] == "successful", printed)
-        printed = command[3] or ""
+        yield Command(command[1], command[2] == "successful", "".join(printed))
+        printed = [command[3] or ""]
