@@ -149,6 +149,12 @@ def test_commands_have_the_phone_s_environment_and_no_descriptors(any_new_phone,
     assert "SECRET_OF_THE_HOST" not in result.stdout
 
 
+def test_proot_has_one_processor(any_new_phone):
+    """On several it would be many times slower."""
+    count = 1 if any_new_phone.launcher.kind == "proot" else len(os.sched_getaffinity(0))
+    assert any_new_phone.run("busybox", "nproc").stdout == f"{count}\n"
+
+
 def test_the_devices_work(any_new_phone):
     assert any_new_phone.output("cat /dev/null; echo x > /dev/null; "
                             "echo x 2>/dev/null >/dev/full || echo full; "
