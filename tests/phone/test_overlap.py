@@ -2,7 +2,6 @@
 # SPDX-License-Identifier: Apache-2.0
 """Calls that overlap: their command lines interleave, their answers do not; and how to prevent it."""
 
-import os
 import pathlib
 import re
 import shlex
@@ -10,6 +9,7 @@ import shlex
 import pytest
 
 from support.phone import ROOT
+from support.processes import open_files
 from support.waiting import wait_for
 from faults import nothing_lost, stage
 
@@ -84,11 +84,7 @@ def test_a_third_call_waits_for_a_thread(phone):
 
 
 def has_socket(client):
-    entries = pathlib.Path(f"/proc/{client.pid}/fd").iterdir()
-    try:
-        return any(os.readlink(entry).startswith("socket:") for entry in entries)
-    except FileNotFoundError:  # the client has closed it meanwhile
-        return False
+    return any(file.startswith("socket:") for file in open_files(client.pid))
 
 
 def locked_line(phone, folder, call):

@@ -5,13 +5,13 @@ lock, a stale number, no room, closed streams."""
 
 import fcntl
 import os
-import pathlib
 import signal
 import subprocess
 
 import pytest
 
 from conftest import SERVICE, Launcher, Phone
+from support.processes import open_files
 from support.waiting import wait_for
 
 
@@ -32,8 +32,7 @@ def start(phone, command):
 
 def has_open(process, path):
     try:
-        return any(os.path.realpath(entry) == str(path)
-                   for entry in pathlib.Path(f"/proc/{process}/fd").iterdir())
+        return str(path) in open_files(process)
     except OSError:  # of a process that is just starting
         return False
 
